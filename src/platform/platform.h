@@ -1,0 +1,113 @@
+// What the library asks of its platform, in the library's own terms. posix/ and windows/ each
+// implement it under the same file names; no other folder of the library includes a system header.
+#ifndef ZARVO_PLATFORM_PLATFORM_H
+#define ZARVO_PLATFORM_PLATFORM_H
+
+#include <cstddef>
+#include <cstdint>
+#include <cstdio>
+#include <ctime>
+
+#include "frame/text_buffer.h"
+#include "zarvo.h"
+
+namespace zv::platform {
+
+// ---- status.cpp: one path on the file system ----------------------------------------------------
+
+// The path as the platform's calls want it, where a caller may write either separator: `path`
+// itself, or a copy in `room`. nullptr when the copy does not fit.
+const char* native_path(const char* path, PathBuffer& room);
+
+// 0 or -1, errno as the platform left it. The paths are native ones; status() follows links.
+int access(const char* path, int mode);
+int status(const char* path, struct _stat64* st);
+int make_directory(const char* path);
+
+// The platform's hidden attribute of a path that exists.
+bool is_hidden(const char* path);
+bool set_hidden(const char* path, bool hidden);
+
+// ---- folders.cpp: folders that the process knows ------------------------------------------------
+
+// As the platform writes them: separators and the trailing one are the caller's to tidy.
+bool working_directory(PathBuffer& out, size_t limit);  // `limit`: bytes offered to the platform
+bool drive_directory(int drive, PathBuffer& out);       // drive 1 is A
+int current_drive();                                    // 0 where there are no drives
+bool long_path(const char* path, PathBuffer& out);      // false unless the path exists and fits
+bool home_folder(PathBuffer& out);
+const char* temp_folder();                            // nullptr when none is named
+char search_path_separator(const char* search_path);  // between the elements of "PATH"
+
+// ---- host.cpp: the user and the machine ---------------------------------------------------------
+
+bool user_name(TextBuffer<257>& out);
+bool host_name(TextBuffer<16>& out);
+
+// ---- clock.cpp: local time ----------------------------------------------------------------------
+
+// The time now on the local clock, and its offset from UTC at that moment.
+bool local_time(struct tm& out, int& offset_minutes);
+
+// ---- stream.cpp: what C streams leave out -------------------------------------------------------
+
+void set_binary(FILE* stream);
+int seek(FILE* stream, int64_t offset, int origin);
+int64_t tell(FILE* stream);
+// Opens for writing, made when missing and not emptied, so that identity can be looked at first.
+FILE* open_unemptied(const char* path);
+bool same_file(FILE* a, FILE* b);
+bool empty_file(FILE* stream);
+
+// ---- directory.cpp: searches --------------------------------------------------------------------
+
+enum class EntryKind { unknown, directory, link, other };
+
+struct Entry {
+  const char* name;  // valid until the next entry is asked for
+  EntryKind kind;    // of the entry itself: a link is a link
+};
+
+// A search through one folder, in the platform's order, "." and ".." included. -1: no search.
+intptr_t search_first(const char* directory, Entry& entry);
+bool search_next(intptr_t search, Entry& entry);
+void search_close(intptr_t search);
+
+// ---- tree.cpp: removal that cannot be led outside its tree
+// ----------------------------------------
+
+// ---- library.cpp: dynamic libraries -------------------------------------------------------------
+
+// nullptr on failure. The path is in either separator style, its extension included.
+void* load_library(const char* path);
+void* library_symbol(void* library, const char* name);
+void unload_library(void* library);
+
+// ---- socket.cpp: IPv4 stream sockets ------------------------------------------------------------
+
+using Socket = intptr_t;
+constexpr Socket no_socket = -1;
+
+struct Address {
+  unsigned char bytes[4];  // network byte order
+};
+
+// Counted: each start that succeeded needs its stop.
+bool network_start();
+void network_stop();
+
+Socket socket_open();
+void socket_close(Socket socket);
+bool socket_connect(Socket socket, const Address& address, unsigned port);
+// Bytes sent or received, 0 when the peer has closed, -1 on failure. Never raises a signal.
+int64_t socket_send(Socket socket, const char* data, size_t size);
+int64_t socket_receive(Socket socket, char* room, size_t size);
+int receive_buffer_size(Socket socket);  // 0 when the platform does not tell
+int send_buffer_size(Socket socket);
+
+bool resolve_name(const char* host, Address& out);
+bool official_host_name(TextBuffer<256>& out);
+
+}  // namespace zv::platform
+
+#endif
