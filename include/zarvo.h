@@ -371,6 +371,11 @@ char* zv_fmt_force(const char* entry, char* name);
  * Copying between locations
  */
 
+/** zv_copy() failed on the side of its source. */
+#define ZV_COPY_SOURCE_FAILED (-3)
+/** zv_copy() failed on the side of its destination. */
+#define ZV_COPY_DESTINATION_FAILED (-4)
+
 int zv_copy(const char* from, const char* to);
 
 #ifdef __cplusplus

@@ -1,0 +1,29 @@
+// Command and header lines: built whole in a bounded buffer, then sent.
+#ifndef ZARVO_TRANSFER_LINE_H
+#define ZARVO_TRANSFER_LINE_H
+
+#include <initializer_list>
+#include <string_view>
+
+#include "frame/text_buffer.h"
+#include "platform/platform.h"
+
+namespace zv {
+
+// Holds the longest line, or whole HTTP request, that a location's path and credentials can give.
+using LineBuffer = TextBuffer<2048>;
+
+using Pieces = std::initializer_list<std::string_view>;
+
+// False when the line does not fit.
+[[nodiscard]] bool build_line(LineBuffer& line, Pieces pieces);
+
+// Sends all of it: a send that a signal cut short goes on where it stopped.
+[[nodiscard]] bool send_all(platform::Socket socket, std::string_view bytes);
+
+// Builds a line and sends it. The pieces hold the line's end too.
+[[nodiscard]] bool send_line(platform::Socket socket, Pieces pieces);
+
+}  // namespace zv
+
+#endif

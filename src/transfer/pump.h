@@ -1,0 +1,28 @@
+// The pumps: the bytes of one file moved between a socket and a stream.
+#ifndef ZARVO_TRANSFER_PUMP_H
+#define ZARVO_TRANSFER_PUMP_H
+
+#include <cstdint>
+#include <cstdio>
+#include <span>
+
+#include "platform/platform.h"
+
+namespace zv {
+
+// Receives exactly `count` bytes: 0; -3 when a receive fails, or the peer closes too early or sends
+// too much; -4 when a write fails. A count of 0 waits for the peer to close.
+int recv_to_file(platform::Socket socket, FILE* file, std::span<char> block, int64_t count);
+
+// Sends the file's next `count` bytes: 0; -3 when the file ends or fails before; -4 when a send
+// fails.
+int send_from_file(platform::Socket socket, FILE* file, std::span<char> block, int64_t count);
+
+// Sends them as base64 lines of 64 characters, the last one shorter, each with CR LF behind it; no
+// bytes are one empty line. Results as of send_from_file(). The block has room for a line and its
+// 48 bytes at least, which is 114.
+int send_base64_file(platform::Socket socket, FILE* file, std::span<char> block, int64_t count);
+
+}  // namespace zv
+
+#endif
