@@ -160,28 +160,303 @@ ZV_API int zv_split_version(const char* version, int* major, int* minor, int* pa
  * Strings
  */
 
-ZV_API size_t zv_strncpy(char* dst, const char* src, size_t size);
-size_t zv_strnulllen(const char* seq);
-void zv_strnull(char* s);
-void zv_strnullrepl(char* seq, char sep);
-size_t zv_strnnullcpy(char* dst, const char* src, size_t size);
-size_t zv_strnnullcat(char* dst, const char* src, size_t size);
-char* zv_strredup(char* old, const char* s);
-void zv_strreplchr(char* s, int from, char to);
+/**
+ * @defgroup copies Bounded copies and zero-separated sequences
+ * The copy behind every sized output, and several texts in one buffer.
+ *
+ * A zero-separated sequence is any number of non-empty texts laid end to end, each with its own
+ * NUL, and one more NUL that closes the whole: `a\0xy\0\0`. Its length counts the texts and their
+ * NULs, 5 here, but not the closing one; a buffer for it needs one byte more than its length.
+ *
+ * @code
+ * char name[32];
+ * if (zv_strncpy(name, text, sizeof name) == sizeof name - 1)
+ *   ;                                         // filled to the end: text may have been cut
+ *
+ * char patterns[] = "*.png;*.jpg;";
+ * zv_strreplchr(patterns, ';', '\0');         // the sequence "*.png" "*.jpg"
+ * @endcode
+ * @{
+ */
 
-size_t zv_strltrim(char* s);
-size_t zv_strrtrim(char* s);
-size_t zv_strtrim(char* s);
-size_t zv_strlwr(char* s);
-size_t zv_strupr(char* s);
-int zv_stricmp(const char* a, const char* b);
-int zv_strnicmp(const char* a, const char* b, size_t n);
-char* zv_strichr(const char* s, int ch);
-char* zv_stristr(const char* s, const char* needle);
-void zv_strlshift(char* s, size_t n);
-void zv_strrshift(char* s, size_t n);
-void zv_strshift(char* s, int n);
-char* zv_strnrepl(char* dst, const char* src, int n);
+/**
+ * Copy a text into a buffer of a given size, cutting what does not fit.
+ *
+ * Unlike strncpy(), always ends the copy with a NUL and never fills the rest of the buffer. A cut
+ * is not reported: a text of size - 1 characters and a longer one give the same result.
+ *
+ * @param dst  the buffer. Must not overlap `src`.
+ * @param src  the text.
+ * @param size the buffer's size in bytes; 0 writes nothing.
+ * @return the length of the text now in `dst`, at most `size` - 1; 0 when `size` is 0.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers.
+ */
+ZV_API size_t zv_strncpy(char* dst, const char* src, size_t size);
+
+/**
+ * Replace a text on the heap.
+ *
+ * Store the result back into the variable that held `old`, which is freed in every case, and before
+ * the copy is made: `s` must not lie inside it.
+ *
+ * @param old a block that the library handed out, or NULL.
+ * @param s   the text to copy, or NULL for none.
+ * @return the copy, to be given back with zv_free(); NULL when `s` is NULL or memory ran out.
+ * @par Thread safety
+ *   Safe from any thread, for distinct blocks.
+ */
+ZV_API char* zv_strredup(char* old, const char* s);
+
+/**
+ * Replace one character by another, wherever it stands.
+ *
+ * The whole of the text is gone through even when `to` is NUL, so that a list whose every piece is
+ * ended by a separator turns into a zero-separated sequence.
+ *
+ * @param s    the text, edited in place.
+ * @param from the character's value as a `signed char` (-128 to 127); any other finds nothing.
+ * @param to   what to put in its place.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts.
+ */
+ZV_API void zv_strreplchr(char* s, int from, char to);
+
+/**
+ * Measure a zero-separated sequence.
+ *
+ * @param seq the sequence.
+ * @return its length, each text's NUL included and the closing one not; 0 when it is empty.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API size_t zv_strnulllen(const char* seq);
+
+/**
+ * Make a zero-separated sequence of a text, by writing one more NUL behind it.
+ *
+ * @param s the text, in a buffer of at least its length + 2 bytes. An empty text becomes the empty
+ *          sequence.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts.
+ */
+ZV_API void zv_strnull(char* s);
+
+/**
+ * Make one text of a zero-separated sequence, with a separator behind each of its pieces.
+ *
+ * The result is what zv_strlist() takes apart again with the same separator.
+ *
+ * @param seq the sequence, edited in place; an empty one stays as it is.
+ * @param sep the separator.
+ * @par Thread safety
+ *   Safe from any thread, for distinct sequences.
+ */
+ZV_API void zv_strnullrepl(char* seq, char sep);
+
+/**
+ * Copy a zero-separated sequence into a buffer of a given size.
+ *
+ * A sequence longer than `size` - 1 is cut there. The buffer's last byte is then a NUL, but the
+ * sequence in it is not closed by a second one: give its length + 1 bytes to have all of it.
+ *
+ * @param dst  the buffer. Must not overlap `src`.
+ * @param src  the sequence.
+ * @param size the buffer's size in bytes; 0 writes nothing.
+ * @return the length copied, at most `size` - 1; 0 when `size` is 0.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers.
+ */
+ZV_API size_t zv_strnnullcpy(char* dst, const char* src, size_t size);
+
+/**
+ * Append a zero-separated sequence to another, within a buffer of a given size.
+ *
+ * What does not fit is cut as zv_strnnullcpy() cuts it.
+ *
+ * @param dst  the buffer with the first sequence in it.
+ * @param src  the sequence to append. Must not overlap `dst`.
+ * @param size the size of the whole buffer in bytes.
+ * @return the length appended; 0 when there is no room for any of it.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers.
+ */
+ZV_API size_t zv_strnnullcat(char* dst, const char* src, size_t size);
+
+/** @} */
+
+/**
+ * @defgroup edits Trimming, case and shifting
+ * Edits of a text where it lies.
+ *
+ * Nothing is allocated and no size is tested: where a text grows, the caller has the room. White
+ * space and case are those of the current C locale, byte by byte.
+ *
+ * @code
+ * char line[80] = "  Key = value \n";
+ * zv_strtrim(line);                           // "Key = value"
+ * zv_strlwr(line);                            // "key = value"
+ * char* rest = zv_strnrepl(line, "name", 3);  // "name = value", rest is " = value"
+ * @endcode
+ * @{
+ */
+
+/**
+ * Remove the white space at the start of a text, moving the rest to the front.
+ *
+ * @param s the text, edited in place.
+ * @return its length now.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts.
+ */
+ZV_API size_t zv_strltrim(char* s);
+
+/**
+ * Remove the white space at the end of a text.
+ *
+ * @param s the text, edited in place.
+ * @return its length now.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts.
+ */
+ZV_API size_t zv_strrtrim(char* s);
+
+/**
+ * Remove the white space at both ends of a text.
+ *
+ * @param s the text, edited in place.
+ * @return its length now.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts.
+ */
+ZV_API size_t zv_strtrim(char* s);
+
+/**
+ * Turn every byte of a text into its lower-case form, as tolower() does it.
+ *
+ * @param s the text, edited in place.
+ * @return its length.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts, while no thread changes the locale.
+ */
+ZV_API size_t zv_strlwr(char* s);
+
+/**
+ * Turn every byte of a text into its upper-case form, as toupper() does it.
+ *
+ * @param s the text, edited in place.
+ * @return its length.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts, while no thread changes the locale.
+ */
+ZV_API size_t zv_strupr(char* s);
+
+/**
+ * Remove characters from the start of a text.
+ *
+ * @param s the text, edited in place.
+ * @param n how many, at most the text's length.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts.
+ */
+ZV_API void zv_strlshift(char* s, size_t n);
+
+/**
+ * Move a text to the right, to make room in front of it.
+ *
+ * The first `n` bytes keep what was there: "abc" moved by 2 reads "ababc" until they are filled.
+ *
+ * @param s the text, in a buffer of at least its length + `n` + 1 bytes.
+ * @param n how far.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts.
+ */
+ZV_API void zv_strrshift(char* s, size_t n);
+
+/**
+ * Move a text to the right, or to the left where the distance is negative.
+ *
+ * @param s the text, with the room that zv_strrshift() asks for.
+ * @param n above 0 as zv_strrshift() by `n`, below 0 as zv_strlshift() by -`n`.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts.
+ */
+ZV_API void zv_strshift(char* s, int n);
+
+/**
+ * Replace the first characters of a text by another text.
+ *
+ * @param dst the text, in a buffer of at least its length - `n` + the length of `src` + 1 bytes.
+ * @param src what to put there, all of it. Must not overlap `dst`.
+ * @param n   how many characters it replaces, from 0 to the length of `dst`.
+ * @return the place in `dst` right behind what was put there.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts.
+ */
+ZV_API char* zv_strnrepl(char* dst, const char* src, int n);
+
+/** @} */
+
+/**
+ * @defgroup nocase Comparison and search without regard to case
+ * Names, keys and header lines that may be written in either case.
+ *
+ * Bytes are compared as unsigned values after tolower() in the current C locale. In the "C" locale
+ * only A to Z and a to z have case, and `_` sorts before every letter.
+ *
+ * @code
+ * if (zv_strnicmp(line, "Content-Length:", 15) == 0) length = atol(line + 15);
+ * const char* found = zv_stristr(page, "<title>");
+ * @endcode
+ * @{
+ */
+
+/**
+ * Compare two texts without regard to case.
+ *
+ * @param a one text.
+ * @param b the other.
+ * @return below 0, 0 or above 0, as `a` sorts before, with or behind `b`.
+ * @par Thread safety
+ *   Safe from any thread, while no thread changes the locale.
+ */
+ZV_API int zv_stricmp(const char* a, const char* b);
+
+/**
+ * Compare the beginnings of two texts without regard to case.
+ *
+ * @param a one text.
+ * @param b the other.
+ * @param n how many characters to compare at most; a NUL ends the comparison before that.
+ * @return below 0, 0 or above 0, as with zv_stricmp(); 0 when `n` is 0.
+ * @par Thread safety
+ *   Safe from any thread, while no thread changes the locale.
+ */
+ZV_API int zv_strnicmp(const char* a, const char* b, size_t n);
+
+/**
+ * Find a character without regard to case.
+ *
+ * @param s  the text.
+ * @param ch the character, taken as a byte. The NUL is never found, unlike with strchr().
+ * @return its first place in `s`; NULL when there is none.
+ * @par Thread safety
+ *   Safe from any thread, while no thread changes the locale.
+ */
+ZV_API char* zv_strichr(const char* s, int ch);
+
+/**
+ * Find a text within another without regard to case.
+ *
+ * @param s      the text to search.
+ * @param needle the text to find. An empty one is never found, unlike with strstr().
+ * @return its first place in `s`; NULL when there is none.
+ * @par Thread safety
+ *   Safe from any thread, while no thread changes the locale.
+ */
+ZV_API char* zv_stristr(const char* s, const char* needle);
+
+/** @} */
 
 int zv_strreplstr(char* s, const char* needle, const char* repl);
 int zv_strireplstr(char* s, const char* needle, const char* repl);

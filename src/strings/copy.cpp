@@ -1,4 +1,7 @@
-// The bounded copy behind every sized output, and zero-separated sequences.
+// The bounded copy behind every sized output, the replaced heap copy and the replaced character.
+#include <algorithm>
+#include <climits>
+#include <cstdlib>
 #include <cstring>
 
 #include "zarvo.h"
@@ -11,4 +14,14 @@ size_t zv_strncpy(char* dst, const char* src, size_t size) {
   std::memcpy(dst, src, length);
   dst[length] = '\0';
   return length;
+}
+
+char* zv_strredup(char* old, const char* s) {
+  std::free(old);
+  return s != nullptr ? static_cast<char*>(zv_dalloc(s, std::strlen(s) + 1)) : nullptr;
+}
+
+void zv_strreplchr(char* s, int from, char to) {
+  if (from < SCHAR_MIN || from > SCHAR_MAX) return;  // no character has that value
+  std::replace(s, s + std::strlen(s), static_cast<char>(from), to);
 }
