@@ -585,15 +585,87 @@ int zv_dir_select(const char* dir, const char* name, const dirsel_t* sel);
  * File status and trees
  */
 
-int zv_access(const char* path, int mode);
-int zv_stat(const char* path, struct _stat64* st);
-int zv_mkdir(const char* path);
-int zv_get_hidden(const char* path);
-int zv_set_hidden(const char* path, int hidden);
+/**
+ * @defgroup tree File status and trees
+ * One path on the file system: what it is, who may use it, whether it is hidden.
+ *
+ * Paths are written with `/` or `\`, whichever comes to hand, on every platform. Nothing is printed;
+ * a failure leaves `errno` (or the platform's last error) as the failing call set it.
+ *
+ * @code
+ * struct _stat64 st;
+ * if (zv_stat("data\\input.txt", &st) == 0 && (st.st_mode & 0xF000) == 0x8000)
+ *   printf("a file of %lld bytes\n", (long long)st.st_size);
+ * @endcode
+ * @{
+ */
+
+/**
+ * Test whether a path exists and may be used.
+ *
+ * @param path the path.
+ * @param mode 0 tests that it exists, 2 that it may be written, 4 that it may be read, 6 both. Bit 0
+ *             is ignored: whether a file may be run is never tested.
+ * @return 0 when the access is possible, -1 when not.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_access(const char* path, int mode);
+
+/**
+ * Read the status of a path. A symbolic link is followed: the status is its target's.
+ *
+ * @param path the path.
+ * @param st   receives the status: among others the size in bytes in `st_size` and the kind in
+ *             `st_mode & 0xF000`, 0x4000 for a directory and 0x8000 for a regular file.
+ * @return 0, or -1 when the path does not exist or cannot be reached.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_stat(const char* path, struct _stat64* st);
+
+/**
+ * Create one directory. Its parent must exist; zv_mkpath() makes a whole chain.
+ *
+ * @param path the directory.
+ * @return 0, or -1 on failure, which a path that exists already is too.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_mkdir(const char* path);
+
+/**
+ * Tell whether a file or a directory has the hidden attribute.
+ *
+ * The attribute is the platform's own on Windows. On Linux it is bit 2 of the extended attribute
+ * `user.DOSATTRIB`, hex text such as `0x2`, the form that file servers and Windows emulators keep
+ * there. A name that begins with a dot is not hidden for that.
+ *
+ * @param path the path.
+ * @return 1 when it is hidden; 0 when it is not, does not exist, or lies where no attributes are
+ *         kept.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_get_hidden(const char* path);
+
+/**
+ * Set or clear the hidden attribute of a file or a directory. All other attributes stay.
+ *
+ * @param path   the path.
+ * @param hidden non-zero to set the attribute, 0 to clear it.
+ * @return 1 when the attribute now has the wanted value, which costs no write when it had it before;
+ *         0 when the path does not exist or the attribute cannot be written.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_set_hidden(const char* path, int hidden);
 
 int zv_mkpath(const char* path);
 int zv_mkfile(const char* path);
 int zv_rmpath(const char* path);
+
+/** @} */
 
 /* ================================================================================================
  * Dynamic libraries and plugins

@@ -1,0 +1,81 @@
+// One path: access, status, making a directory, the hidden attribute.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <string>
+
+#include "scratch_folder.h"
+#include "wine.h"
+#include "zarvo.h"
+
+namespace {
+
+int kind_of(const std::string& path) {
+  struct _stat64 st;
+  return zv_stat(path.c_str(), &st) == 0 ? st.st_mode & 0xF000 : -1;
+}
+
+TEST(Status, AccessNeverTestsExecution) {
+  const ScratchFolder scratch;
+  const std::string file = scratch.make_file("plain.txt", "x");
+  for (int mode = 0; mode < 8; ++mode) {
+    EXPECT_EQ(zv_access(file.c_str(), mode), 0) << mode;
+    EXPECT_EQ(zv_access(scratch.path("missing").c_str(), mode), -1) << mode;
+  }
+}
+
+TEST(Status, KindAndSize) {
+  const ScratchFolder scratch;
+  const std::string file = scratch.make_file("sub/five", "12345");
+  struct _stat64 st;
+  ASSERT_EQ(zv_stat(file.c_str(), &st), 0);
+  EXPECT_EQ(st.st_size, 5);
+  EXPECT_EQ(kind_of(file), 0x8000);
+  EXPECT_EQ(kind_of(scratch.path("sub")), 0x4000);
+  EXPECT_EQ(kind_of(scratch.path("missing")), -1);
+}
+
+TEST(Status, EitherSeparatorStyle) {
+  const ScratchFolder scratch;
+  std::string sub = scratch.path("made");
+  std::replace(sub.begin(), sub.end(), '/', '\\');
+  EXPECT_EQ(zv_mkdir(sub.c_str()), 0);
+  EXPECT_EQ(zv_mkdir(sub.c_str()), -1);
+  EXPECT_EQ(kind_of(sub), 0x4000);
+  EXPECT_EQ(zv_access(sub.c_str(), 0), 0);
+  EXPECT_TRUE(scratch.exists("made"));
+  EXPECT_EQ(zv_mkdir((sub + "\\no\\parent").c_str()), -1);
+
+  const std::string too_long = sub + "\\" + std::string(ZV_PATH_MAX, 'x');
+  EXPECT_EQ(kind_of(too_long), -1);
+}
+
+TEST(Status, Hidden) {
+  const ScratchFolder scratch;
+  const std::string folder = scratch.make_folder("folder");
+  const std::string file = scratch.make_file("file");
+  if (zv_set_hidden(file.c_str(), 1) == 0) GTEST_SKIP() << "no attributes on this file system";
+
+  for (const std::string& path : {folder, file}) {
+    SCOPED_TRACE(path);
+    zv_set_hidden(path.c_str(), 0);
+    EXPECT_EQ(zv_get_hidden(path.c_str()), 0);
+    EXPECT_EQ(zv_set_hidden(path.c_str(), 0), 1);
+    EXPECT_EQ(zv_set_hidden(path.c_str(), 5), 1);
+    EXPECT_EQ(zv_set_hidden(path.c_str(), 1), 1);
+    EXPECT_EQ(zv_get_hidden(path.c_str()), 1);
+    EXPECT_EQ(zv_set_hidden(path.c_str(), 0), 1);
+    EXPECT_EQ(zv_get_hidden(path.c_str()), 0);
+  }
+  EXPECT_EQ(zv_get_hidden(scratch.path("missing").c_str()), 0);
+  EXPECT_EQ(zv_set_hidden(scratch.path("missing").c_str(), 0), 0);
+  EXPECT_EQ(zv_set_hidden(scratch.path("missing").c_str(), 1), 0);
+}
+
+TEST(Status, ADotIsNoAttribute) {
+  if (under_wine()) GTEST_SKIP() << "Wine gives dot files the hidden attribute";
+  const ScratchFolder scratch;
+  EXPECT_EQ(zv_get_hidden(scratch.make_file(".dotted").c_str()), 0);
+}
+
+}  // namespace
