@@ -57,7 +57,7 @@ int64_t tell(FILE* stream);
 // Opens for writing, made when missing and not emptied, so that identity can be looked at first.
 FILE* open_unemptied(const char* path);
 bool same_file(FILE* a, FILE* b);
-bool empty_file(FILE* stream);
+bool empty_file(FILE* stream);  // true also for what has no length, such as a device
 
 // ---- directory.cpp: searches --------------------------------------------------------------------
 
@@ -73,8 +73,7 @@ intptr_t search_first(const char* directory, Entry& entry);
 bool search_next(intptr_t search, Entry& entry);
 void search_close(intptr_t search);
 
-// ---- tree.cpp: removal that cannot be led outside its tree
-// ----------------------------------------
+// ---- tree.cpp: removal that cannot be led outside its tree --------------------------------------
 
 // ---- library.cpp: dynamic libraries -------------------------------------------------------------
 
