@@ -491,19 +491,175 @@ int zv_strlist_reduce(char*** list, int n, int pos);
  * Paths
  */
 
-int zv_ispath_DOS(const char* path);
-int zv_ispath_UNC(const char* path);
-int zv_ispath_UNIX(const char* path);
-int zv_ispath_relative(const char* path);
-int zv_ispath_root(const char* path);
-char* zv_slash(const char* path);
-char* zv_dot(const char* path);
-int zv_add_slash(char* path);
-int zv_trim_slash(char* path);
-void zv_split_path(char* path);
-int zv_extract_directory(const char* path, char* out, size_t size);
-int zv_extract_filename(const char* path, char* out, size_t size);
-int zv_extract_extension(const char* path, char* out, size_t size);
+/**
+ * @defgroup paths Paths
+ * One path algebra for DOS, UNC and UNIX paths, on every platform.
+ *
+ * A canonical path is separated by `/` alone. Its root is `X:/`, `/` or `//server/share/`, and
+ * apart from a root it ends with no separator. zv_normalize_path() makes one of what a user wrote;
+ * the other functions expect one and take a backslash for an ordinary character. Only
+ * zv_normalize_path(), the path map and the search path look beyond the text.
+ *
+ * @code
+ * char path[ZV_PATH_MAX] = "~\\notes\\..\\todo.txt";
+ * char folder[ZV_PATH_MAX];
+ * if (zv_normalize_path(path)) zv_extract_directory(path, folder, sizeof folder);
+ * @endcode
+ * @{
+ */
+
+/**
+ * Tell whether a path has the DOS form: any first character, then `:`.
+ *
+ * `X:` and `X:name`, which are relative to the current folder of a drive, have it too.
+ *
+ * @param path the path.
+ * @return 1 if it has, else 0.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_ispath_DOS(const char* path);
+
+/**
+ * Tell whether a path has the UNC form: `//`, a server, `/` and the first character of a share.
+ *
+ * @param path the path.
+ * @return 1 if it has, else 0: `//server`, `//server/` and `///x` have none of the forms.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_ispath_UNC(const char* path);
+
+/**
+ * Tell whether a path has the UNIX form: one `/` in front and no second one.
+ *
+ * @param path the path.
+ * @return 1 if it has, else 0.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_ispath_UNIX(const char* path);
+
+/**
+ * Tell whether a path is relative: it begins with no `/` and has no `:` as its second character.
+ *
+ * @param path the path.
+ * @return 1 if it is, also for the empty path; 0 if not, also for `X:name`.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_ispath_relative(const char* path);
+
+/**
+ * Tell whether a path is a root: `X:/`, `/`, or `//server/share` with or without one `/` behind it.
+ *
+ * @param path the path.
+ * @return 1 if it is, else 0: `X:` alone is none.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_ispath_root(const char* path);
+
+/**
+ * Find the last separator.
+ *
+ * @param path the path.
+ * @return the last `/` in `path`, or its terminating NUL when there is none.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API char* zv_slash(const char* path);
+
+/**
+ * Find the extension of the last component.
+ *
+ * A dot starts an extension unless it is the first or the last character of its name: `.profile`
+ * and `name.` have none, and `a.tar.gz` has `.gz`.
+ *
+ * @param path the path.
+ * @return the dot in `path`, or its terminating NUL when there is no extension.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API char* zv_dot(const char* path);
+
+/**
+ * End a path with a separator.
+ *
+ * @param path the path, in a buffer with room for one more character.
+ * @return 1 if a `/` was appended; 0 if the path is empty or ended with one.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers.
+ */
+ZV_API int zv_add_slash(char* path);
+
+/**
+ * Remove the separators at the end of a path that is no root, and give a UNC root its own.
+ *
+ * Whether the path is a root is looked at once, before anything is removed: `X://` becomes `X:`.
+ *
+ * @param path the path, in a buffer with room for one more character.
+ * @return how many separators were removed; 1 if one was appended to a UNC root; 0 if nothing
+ *         changed.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers.
+ */
+ZV_API int zv_trim_slash(char* path);
+
+/**
+ * Split a path in place into its pieces, each ended by a NUL, with an empty piece behind the last.
+ *
+ * The first piece of an absolute path is its root with its separator: `X:/a/b` becomes `X:/`, `a`
+ * and `b`. `X:` and `X:name` have no root and split as a relative path does. An empty piece ends
+ * the sequence, so that what follows a doubled separator is lost. zv_strlist() with the separator
+ * 0 makes a list of the pieces.
+ *
+ * @param path the path, in a buffer with room for two more characters.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers.
+ */
+ZV_API void zv_split_path(char* path);
+
+/**
+ * Take out the folder that a path lies in.
+ *
+ * A root is its own folder, and a path that ends with `.` or `..` is taken whole. Separators at the
+ * end do not count. At most 319 characters of the path take part.
+ *
+ * @param path the path.
+ * @param out  receives the folder, cut to `size` - 1 characters; may be `path` itself.
+ * @param size bytes in `out`.
+ * @return 1 if `out` is not empty, else 0: a lone name lies in no folder.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers.
+ */
+ZV_API int zv_extract_directory(const char* path, char* out, size_t size);
+
+/**
+ * Take out the last component of a path.
+ *
+ * Separators at the end do not count. At most 319 characters of the path take part.
+ *
+ * @param path the path.
+ * @param out  receives the name, cut to `size` - 1 characters; may be `path` itself.
+ * @param size bytes in `out`.
+ * @return 1 if `out` is not empty, else 0: a root, `.` and `..` are no names.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers.
+ */
+ZV_API int zv_extract_filename(const char* path, char* out, size_t size);
+
+/**
+ * Take out the extension that zv_dot() finds, with its dot.
+ *
+ * @param path the path.
+ * @param out  receives the extension, cut to `size` - 1 characters; may be `path` itself.
+ * @param size bytes in `out`.
+ * @return 1 if `out` is not empty, else 0.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers.
+ */
+ZV_API int zv_extract_extension(const char* path, char* out, size_t size);
 
 int zv_normalize_path(char* path);
 int zv_absolute(const char* path, const char* base, char* out, size_t size);
@@ -515,6 +671,8 @@ int zv_pathmap_locate(char* path);
 
 int zv_pathlist(char*** list);
 int zv_path_locate(char* path);
+
+/** @} */
 
 /* ================================================================================================
  * Host and private environment

@@ -1,0 +1,48 @@
+// The forms of a path and its root, told from the text alone. Only '/' separates here.
+#ifndef ZARVO_PATH_FORM_H
+#define ZARVO_PATH_FORM_H
+
+#include <cstddef>
+#include <string_view>
+
+#include "frame/text_buffer.h"
+
+namespace zv {
+
+// "X:" in front, whatever the character before the colon.
+bool is_dos(std::string_view path);
+
+// The length of "//server/share" in front of a path; 0 when it has no such front.
+size_t share_size(std::string_view path);
+
+// "X:/", "/" or "//server/share" with or without one '/' behind it, and nothing more.
+bool is_root(std::string_view path);
+
+// The length of a path's root piece with the separator that ends it. A drive-relative path has
+// none; a bare "//server/share" is all root.
+size_t root_size(std::string_view path);
+
+// What is left of a path without the separators at its end.
+std::string_view without_slashes(std::string_view path);
+
+// A root ends with its one separator and any other path with none. Whether the path was a root is
+// looked at before anything is cut, as zv_trim_slash() tells. False, and the text as it was, when
+// the separator that a share needs does not fit.
+template <size_t Size>
+[[nodiscard]] bool trim_slash(TextBuffer<Size>& path) {
+  if (!is_root(path.view())) {
+    path.shorten(without_slashes(path.view()).size());
+    return true;
+  }
+  return path.back() == '/' || path.append('/');
+}
+
+// A folder as a platform or a variable writes it, brought into canonical form.
+[[nodiscard]] inline bool tidy_folder(PathBuffer& folder) {
+  folder.replace('\\', '/');
+  return trim_slash(folder);
+}
+
+}  // namespace zv
+
+#endif
