@@ -63,7 +63,7 @@ def banned_calls(name, lines):
             yield number, f"{call[1]}() is not called here; use {BANNED[call[1]]}"
 
 
-def long_functions(name, lines):
+def long_functions(lines):
     """A block whose head has an argument list, outside any other such block, is a function's."""
     blocks = []
     head = ""
@@ -91,7 +91,7 @@ def breaches(name):
     yield from platform_breaches(name, lines)
     yield from banned_calls(name, lines)
     if not name.startswith("tests/"):
-        yield from long_functions(name, lines)
+        yield from long_functions(lines)
     if len(raw) > LONGEST_FILE and not name.startswith(("tests/", "include/")):
         yield 1, f"a file of {len(raw)} lines"
     for number, line in enumerate(raw, 1):

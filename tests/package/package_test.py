@@ -1,0 +1,149 @@
+#!/usr/bin/env python3
+"""Installs the library from a build folder and looks at it as a stranger would: does an application
+build against it and run, does it need what it may need, does it export what its header declares.
+
+    package_test.py SOURCE BUILD CC CXX OBJDUMP [--toolchain FILE --emulator WINE]
+"""
+import argparse
+import os
+import re
+import shutil
+import subprocess
+import unittest
+from pathlib import Path
+
+WARNINGS = ["-Wall", "-Wextra", "-Wpedantic", "-Wconversion", "-Wshadow", "-Werror"]
+WINDOWS_OWN = {"kernel32.dll", "msvcrt.dll", "advapi32.dll", "ws2_32.dll"}
+
+
+def run(*command, **more):
+    """The output of a command, which must succeed."""
+    done = subprocess.run([str(word) for word in command], stdout=subprocess.PIPE,
+                          stderr=subprocess.STDOUT, text=True, timeout=120, check=False, **more)
+    if done.returncode != 0:
+        raise AssertionError(f"{' '.join(map(str, command))}: {done.returncode}\n{done.stdout}")
+    return done.stdout
+
+
+class Package(unittest.TestCase):
+    @classmethod
+    def setUpClass(cls):
+        cls.root = args.build / "package"
+        cls.prefix = cls.root / "prefix"
+        shutil.rmtree(cls.root, ignore_errors=True)
+        run("cmake", "--install", args.build, "--prefix", cls.prefix)
+        cls.library = cls.prefix / ("bin/zarvo.dll" if args.windows else "lib/libzarvo.so")
+        cls.declared = re.findall(r"^ZV_API [^;(]*?(\w+)\(", (args.source / "include/zarvo.h")
+                                  .read_text(), flags=re.M)
+
+    def run_program(self, program):
+        env = dict(os.environ, LD_LIBRARY_PATH=str(self.prefix / "lib"),
+                   WINEPATH="Z:" + str(self.prefix / "bin").replace("/", "\\"))
+        emulator = [args.emulator] if args.windows else []
+        return run(*emulator, program, env=env, cwd=self.root)
+
+    def pkg_config(self, *words):
+        env = dict(os.environ, PKG_CONFIG_LIBDIR=str(self.prefix / "lib/pkgconfig"))
+        return run("pkg-config", *words, "zarvo", env=env).split()
+
+    def build_with_pkg_config(self, source):
+        program = self.root / (source.stem + ".exe")
+        run(args.cc, "-std=c99", *WARNINGS, source, "-o", program,
+            *self.pkg_config("--cflags", "--libs"))
+        return self.run_program(program)
+
+    def test_files(self):
+        expected = ["include/zarvo.h", "lib/pkgconfig/zarvo.pc", "lib/libzarvo.a",
+                    "lib/cmake/zarvo/zarvoConfig.cmake", "lib/cmake/zarvo/zarvoConfigVersion.cmake"]
+        expected += ["bin/zarvo.dll", "lib/libzarvo.dll.a"] if args.windows else \
+            ["lib/libzarvo.so", "lib/libzarvo.so.1"]
+        missing = [name for name in expected if not (self.prefix / name).exists()]
+        self.assertEqual(missing, [])
+        self.assertEqual(self.pkg_config("--modversion"), ["1.0.0"])
+
+    def test_application_through_pkg_config(self):
+        output = self.build_with_pkg_config(args.source / "tests/package/consumer/consumer.c")
+        self.assertEqual(output.strip(), "consumer: ok")
+
+    def test_application_through_find_package(self):
+        build = self.root / "consumer"
+        toolchain = ["--toolchain", args.toolchain] if args.windows else \
+            [f"-DCMAKE_C_COMPILER={args.cc}"]
+        run("cmake", "-S", args.source / "tests/package/consumer", "-B", build, "-G", "Ninja",
+            f"-DCMAKE_PREFIX_PATH={self.prefix}", f"-DCMAKE_FIND_ROOT_PATH={self.prefix}",
+            *toolchain)
+        run("cmake", "--build", build)
+        for name in ("consumer", "consumer_static"):
+            program = build / "bin" / (name + (".exe" if args.windows else ""))
+            self.assertEqual(self.run_program(program).strip(), "consumer: ok")
+
+    def test_first_program_of_the_readme(self):
+        blocks = re.findall(r"```c\n(.*?)```", (args.source / "README.md").read_text(), flags=re.S)
+        self.assertTrue(blocks)
+        for number, block in enumerate(blocks):
+            source = self.root / f"readme{number}.c"
+            source.write_text(block)
+            self.build_with_pkg_config(source)
+
+    def test_header_compiles_alone(self):
+        for name, compiler, standard in (("a.c", args.cc, "c99"), ("a.cpp", args.cxx, "c++11")):
+            source = self.root / name
+            source.write_text("#include <zarvo.h>\n#include <zarvo.h>\n")
+            run(compiler, f"-std={standard}", *WARNINGS, "-Wstrict-prototypes"
+                if name == "a.c" else "-Wextra", "-fsyntax-only", source,
+                "-I", self.prefix / "include")
+
+    def test_exports_are_the_headers(self):
+        if args.windows:
+            table = run(args.objdump, "-p", self.library).split("[Ordinal/Name Pointer] Table")[1]
+            exported = re.findall(r"^\s*\[\s*\d+\] (\w+)", table, flags=re.M)
+        else:
+            symbols = run("readelf", "--dyn-syms", "-W", self.library)
+            exported = [line.split()[7].split("@")[0] for line in symbols.splitlines()
+                        if re.search(r"\s(FUNC|OBJECT)\s+(GLOBAL|WEAK)\s+DEFAULT\s+\d", line)
+                        and "ZARVO" in line and " ABS " not in line]
+        self.assertGreater(len(self.declared), 10)
+        self.assertEqual(sorted(exported), sorted(self.declared))
+
+    def test_needs_only_the_system(self):
+        if args.windows:
+            needed = {name.lower() for name in
+                      re.findall(r"DLL Name: (\S+)", run(args.objdump, "-p", self.library))}
+            self.assertLessEqual(needed, WINDOWS_OWN)
+        else:
+            dynamic = run("readelf", "-dW", self.library)
+            self.assertEqual(re.findall(r"\(NEEDED\).*\[(.*)\]", dynamic), ["libc.so.6"])
+            self.assertEqual(re.findall(r"\(SONAME\).*\[(.*)\]", dynamic), ["libzarvo.so.1"])
+
+    def test_hardening(self):
+        if args.windows:
+            flags = run(args.objdump, "-p", self.library)
+            for flag in ("HIGH_ENTROPY_VA", "DYNAMIC_BASE", "NX_COMPAT"):
+                self.assertRegex(flags, flag)
+            return
+        text = run("readelf", "-dlW", "--dyn-syms", self.library)
+        self.assertRegex(text, r"GNU_RELRO")
+        self.assertRegex(text, r"\bNOW\b")
+        self.assertRegex(text, r"GNU_STACK\s+(0x\w+\s+){5}RW ")
+        self.assertNotRegex(text, r"TEXTREL")
+        self.assertRegex(text, r"UND __stack_chk_fail")
+        self.assertRegex(text, r"UND __\w+_chk@")
+
+
+def arguments():
+    parser = argparse.ArgumentParser()
+    parser.add_argument("source", type=Path)
+    parser.add_argument("build", type=Path)
+    parser.add_argument("cc")
+    parser.add_argument("cxx")
+    parser.add_argument("objdump")
+    parser.add_argument("--toolchain")
+    parser.add_argument("--emulator")
+    found = parser.parse_args()
+    found.windows = found.toolchain is not None
+    return found
+
+
+if __name__ == "__main__":
+    args = arguments()
+    unittest.main(argv=["package_test.py", "-v"])
