@@ -678,14 +678,88 @@ int zv_path_locate(char* path);
  * Host and private environment
  */
 
-size_t zv_homedir(char* buf, size_t size);
-size_t zv_tempdir(char* buf, size_t size);
-int zv_getcwd(char* buf, size_t size);
-size_t zv_username(char* buf, size_t size);
-size_t zv_hostname(char* buf, size_t size);
+/**
+ * @defgroup host Host and private environment
+ * Who and where the process is, and variables that only this process sees.
+ *
+ * Folders come back in canonical form. The process environment is read as safely as getenv() reads
+ * it, which is not at all while another thread changes it: for settings that threads share there is
+ * the private environment.
+ *
+ * @code
+ * char folder[ZV_PATH_MAX];
+ * if (zv_tempdir(folder, sizeof folder) == 0) return -1;
+ * zv_putenv_private("PLG", "/opt/app/plugins", 0);
+ * @endcode
+ * @{
+ */
+
+/**
+ * Tell the user's home folder: on Windows the documents folder that the registry names, elsewhere
+ * the variable `HOME`, or what the user database says where that is not set or empty.
+ *
+ * @param buf  receives the folder, cut to `size` - 1 characters.
+ * @param size bytes in `buf`.
+ * @return the folder's length; 0 on failure: the platform names none, or none shorter than
+ *         #ZV_PATH_MAX, and `buf` is untouched, or what stands in `buf` is no folder that may be
+ *         read and written.
+ * @par Thread safety
+ *   Safe from any thread while none changes the process environment.
+ */
+ZV_API size_t zv_homedir(char* buf, size_t size);
+
+/**
+ * Tell the folder for temporary files: the variable `TMP`, else `TEMP`, and on Linux else `TMPDIR`.
+ *
+ * The first of them that is set decides, even where it names no usable folder; on Linux an empty
+ * one counts as not set. On Windows the long form of the folder is given.
+ *
+ * @param buf  receives the folder, cut to `size` - 1 characters.
+ * @param size bytes in `buf`.
+ * @return the folder's length; 0 on failure: no variable is set and `buf` is untouched, or what
+ *         stands in `buf` is no folder that may be read and written.
+ * @par Thread safety
+ *   Safe from any thread while none changes the process environment.
+ */
+ZV_API size_t zv_tempdir(char* buf, size_t size);
+
+/**
+ * Tell the working directory.
+ *
+ * @param buf  receives the folder.
+ * @param size bytes in `buf`; more than #ZV_PATH_MAX count as that.
+ * @return 1; 0 on failure, `buf` being empty: a longer folder is never cut.
+ * @par Thread safety
+ *   Safe from any thread while none changes the working directory.
+ */
+ZV_API int zv_getcwd(char* buf, size_t size);
+
+/**
+ * Tell the name of the user that the process runs as, "nobody" where the platform tells none.
+ *
+ * @param buf  receives the name, cut to `size` - 1 characters.
+ * @param size bytes in `buf`.
+ * @return the length of the text in `buf`; never fails.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API size_t zv_username(char* buf, size_t size);
+
+/**
+ * Tell the computer's name, "localhost" where the platform tells none of at most 15 characters.
+ *
+ * @param buf  receives the name, cut to `size` - 1 characters.
+ * @param size bytes in `buf`.
+ * @return the length of the text in `buf`; never fails.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API size_t zv_hostname(char* buf, size_t size);
 
 int zv_putenv_private(const char* name, const char* value, int append);
 char* zv_getenv_private(const char* name);
+
+/** @} */
 
 /* ================================================================================================
  * Byte order
@@ -747,8 +821,8 @@ int zv_dir_select(const char* dir, const char* name, const dirsel_t* sel);
  * @defgroup tree File status and trees
  * One path on the file system: what it is, who may use it, whether it is hidden.
  *
- * Paths are written with `/` or `\`, whichever comes to hand, on every platform. Nothing is printed;
- * a failure leaves `errno` (or the platform's last error) as the failing call set it.
+ * Paths are written with `/` or `\`, whichever comes to hand, on every platform. Nothing is
+ * printed; a failure leaves `errno` (or the platform's last error) as the failing call set it.
  *
  * @code
  * struct _stat64 st;
@@ -762,8 +836,8 @@ int zv_dir_select(const char* dir, const char* name, const dirsel_t* sel);
  * Test whether a path exists and may be used.
  *
  * @param path the path.
- * @param mode 0 tests that it exists, 2 that it may be written, 4 that it may be read, 6 both. Bit 0
- *             is ignored: whether a file may be run is never tested.
+ * @param mode 0 tests that it exists, 2 that it may be written, 4 that it may be read, 6 both. Bit
+ * 0 is ignored: whether a file may be run is never tested.
  * @return 0 when the access is possible, -1 when not.
  * @par Thread safety
  *   Safe from any thread.
@@ -812,8 +886,8 @@ ZV_API int zv_get_hidden(const char* path);
  *
  * @param path   the path.
  * @param hidden non-zero to set the attribute, 0 to clear it.
- * @return 1 when the attribute now has the wanted value, which costs no write when it had it before;
- *         0 when the path does not exist or the attribute cannot be written.
+ * @return 1 when the attribute now has the wanted value, which costs no write when it had it
+ * before; 0 when the path does not exist or the attribute cannot be written.
  * @par Thread safety
  *   Safe from any thread.
  */

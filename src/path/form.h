@@ -37,12 +37,6 @@ template <size_t Size>
   return path.back() == '/' || path.append('/');
 }
 
-// A folder as a platform or a variable writes it, brought into canonical form.
-[[nodiscard]] inline bool tidy_folder(PathBuffer& folder) {
-  folder.replace('\\', '/');
-  return trim_slash(folder);
-}
-
 }  // namespace zv
 
 #endif

@@ -35,14 +35,14 @@ bool working_directory(PathBuffer& out, size_t limit);  // `limit`: bytes offere
 bool drive_directory(int drive, PathBuffer& out);       // drive 1 is A
 int current_drive();                                    // 0 where there are no drives
 bool long_path(const char* path, PathBuffer& out);      // false unless the path exists and fits
-bool home_folder(PathBuffer& out);
-const char* temp_folder();                            // nullptr when none is named
-char search_path_separator(const char* search_path);  // between the elements of "PATH"
+const char* temp_folder();                              // nullptr when none is named
+char search_path_separator(const char* search_path);    // between the elements of "PATH"
 
 // ---- host.cpp: the user and the machine ---------------------------------------------------------
 
 bool user_name(TextBuffer<257>& out);
 bool host_name(TextBuffer<16>& out);
+bool home_folder(PathBuffer& out);  // as the platform writes it
 
 // ---- clock.cpp: local time ----------------------------------------------------------------------
 
