@@ -950,12 +950,74 @@ char* zv_fmt_force(const char* entry, char* name);
  * Copying between locations
  */
 
+/**
+ * @defgroup transfer Copying between locations
+ * One operation that moves one file: between two places on the disk, from or to an FTP or HTTP
+ * server, or into a mail.
+ *
+ * A location is one of these texts; the scheme is read in either case:
+ *
+ * | Text | Location |
+ * |---|---|
+ * | `ftp://[user[:password]@]host[:port]/path` | a file on an FTP server, port 21 |
+ * | `http://[user[:password]@]host[:port]/path` | a resource of a web server, port 80 |
+ * | `smtp://[user[:password]@]host[:port]/recipient` | a mail to an address, port 25 |
+ * | `file://path` | a local file; `file:///D:/f` and `file:///D|/f` name `D:/f` |
+ * | anything else | a local path, in either separator style |
+ *
+ * The last `@` before the first `/` ends the credentials, so a user may hold one (`u@d:pw@host`).
+ * Without a port the credentials divide at their last `:`, with one at their first. In the path
+ * behind a scheme, `%` and two hexadecimal digits stand for a byte; user, password and plain paths
+ * are taken as written. `?` and `#` are characters like others. A host is a name with an IPv4
+ * address, or four decimal numbers.
+ *
+ * @code
+ * zv_copy("http://example.com/data.bin", "D:\\data.bin");
+ * zv_copy("report.pdf", "ftp://user:pw@example.com/in/report.pdf");
+ * zv_copy("report.pdf", "smtp://me@example.com:pw@mail.example.com/you%40example.org");
+ * @endcode
+ * @{
+ */
+
 /** zv_copy() failed on the side of its source. */
 #define ZV_COPY_SOURCE_FAILED (-3)
 /** zv_copy() failed on the side of its destination. */
 #define ZV_COPY_DESTINATION_FAILED (-4)
 
-int zv_copy(const char* from, const char* to);
+/**
+ * Copy the contents of one file to another location.
+ *
+ * - It blocks until the transfer ends or fails; the network has no time limit but the platform's.
+ * - Nothing is encrypted: users, passwords and files travel in the clear. An FTP server may name
+ *   any address for the data connection, and it is used.
+ * - A local destination is emptied before its source is opened on the network, and a failure leaves
+ *   it empty or partial. Only a source that is not local or not readable, a directory among them,
+ *   or is the destination itself under whatever name, leaves a local destination as it was.
+ * - FTP (RFC 959) is passive, binary and anonymous without a user. The server must tell the size
+ *   when it starts to send, and a file of 0 bytes cannot be fetched.
+ * - HTTP is 1.0 (RFC 1945): GET and PUT, one request without a `Host` line, no redirects. A
+ * response must announce its length, and that must not be 0. A user is sent as Basic credentials.
+ * - A mail (RFC 5321, RFC 2045) carries the file as an attachment under its own name. It comes from
+ *   the location's user when that holds an `@`, else from the local user. A user asks for a login.
+ * - Between two network locations the file goes through a private folder in the temporary folder,
+ *   which is removed.
+ * - No text adds a command or a header line: CR or LF in the user, password or decoded path of a
+ *   network location makes it unusable.
+ *
+ * @param from the source: at most 318 characters behind the scheme; not `smtp://`. NULL or "" is a
+ *             failure of its side.
+ * @param to   the destination, likewise.
+ * @return 0 when all of the file has arrived and, in a local file, been written and closed.
+ *         #ZV_COPY_SOURCE_FAILED (-3) for a source location that is not usable, a local file that
+ *         cannot be read, a server that fails or refuses to deliver, and whatever the local machine
+ *         lacks beside a local source. #ZV_COPY_DESTINATION_FAILED (-4) likewise for the
+ *         destination, which is looked at only once the source location is found usable.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_copy(const char* from, const char* to);
+
+/** @} */
 
 #ifdef __cplusplus
 }

@@ -1,0 +1,51 @@
+#include "transfer/connection.h"
+
+namespace zv {
+
+namespace {
+
+// The platform's answer, unless there is none or it would not hold a reply.
+size_t block_size(int told) {
+  return told < 4096 ? 65536 : static_cast<size_t>(told);
+}
+
+bool is_directory(const struct _stat64& st) {
+  return (st.st_mode & 0xF000) == 0x4000;
+}
+
+}  // namespace
+
+bool SocketOwner::open() {
+  close();
+  socket_ = platform::socket_open();
+  return socket_ != platform::no_socket;
+}
+
+void SocketOwner::close() {
+  if (socket_ != platform::no_socket) platform::socket_close(socket_);
+  socket_ = platform::no_socket;
+}
+
+bool TransferBuffer::allocate(size_t block_size) {
+  bytes_.reset(static_cast<char*>(std::malloc(block_size + 1)));
+  block_size_ = block_size;
+  return bytes_ != nullptr;
+}
+
+int Connection::open(const platform::Address& address, unsigned port) {
+  if (!control.open()) return network_failed();
+  const int told = direction == Direction::download ? platform::receive_buffer_size(control.get())
+                                                    : platform::send_buffer_size(control.get());
+  if (!buffer.allocate(block_size(told))) return local_failed();
+  return platform::socket_connect(control.get(), address, port) ? copied : network_failed();
+}
+
+bool open_source(const char* path, StreamPtr& file, int64_t& size) {
+  struct _stat64 st;
+  if (platform::status(path, &st) != 0 || is_directory(st)) return false;
+  size = st.st_size;
+  file.reset(std::fopen(path, "rb"));
+  return file != nullptr;
+}
+
+}  // namespace zv

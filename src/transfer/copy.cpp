@@ -1,0 +1,54 @@
+// The one transfer operation: picks the road between two locations.
+#include "transfer/http.h"
+#include "transfer/local.h"
+#include "transfer/location.h"
+#include "transfer/result.h"
+
+namespace {
+
+using zv::location_t;
+
+int download(const location_t& source, const char* local) {
+  const char* const user = source.user.c_str();
+  const char* const password = source.password.c_str();
+  const char* const path = source.path.c_str();
+  switch (source.kind) {
+    case zv::LOC_HTTP:
+      return zv::http_get(source.addr, source.port, user, password, path, local);
+    default:
+      return zv::source_failed;
+  }
+}
+
+int upload(const char* local, const location_t& destination) {
+  const char* const user = destination.user.c_str();
+  const char* const password = destination.password.c_str();
+  const char* const path = destination.path.c_str();
+  switch (destination.kind) {
+    case zv::LOC_HTTP:
+      return zv::http_put(destination.addr, destination.port, user, password, local, path);
+    default:
+      return zv::destination_failed;
+  }
+}
+
+}  // namespace
+
+int zv_copy(const char* from, const char* to) {
+  location_t source;
+  zv::parse_location(from, source);
+  if (source.kind == zv::LOC_NONE || source.kind == zv::LOC_SMTP) return zv::source_failed;
+
+  location_t destination;
+  zv::parse_location(to, destination);
+  if (destination.kind == zv::LOC_NONE) return zv::destination_failed;
+
+  const char* const source_path = source.path.c_str();
+  const char* const destination_path = destination.path.c_str();
+  const bool from_local = source.kind == zv::LOC_FILE;
+  const bool to_local = destination.kind == zv::LOC_FILE;
+  if (from_local && to_local) return zv::copy_local(source_path, destination_path);
+  if (from_local) return upload(source_path, destination);
+  if (to_local) return download(source, destination_path);
+  return zv::source_failed;
+}

@@ -1,0 +1,26 @@
+#include "transfer/line.h"
+
+namespace zv {
+
+bool build_line(LineBuffer& line, Pieces pieces) {
+  line.clear();
+  for (const std::string_view piece : pieces)
+    if (!line.append(piece)) return false;
+  return true;
+}
+
+bool send_all(platform::Socket socket, std::string_view bytes) {
+  while (!bytes.empty()) {
+    const int64_t sent = platform::socket_send(socket, bytes.data(), bytes.size());
+    if (sent < 0) return false;
+    bytes.remove_prefix(static_cast<size_t>(sent));
+  }
+  return true;
+}
+
+bool send_line(platform::Socket socket, Pieces pieces) {
+  LineBuffer line;
+  return build_line(line, pieces) && send_all(socket, line.view());
+}
+
+}  // namespace zv

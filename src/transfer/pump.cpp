@@ -1,0 +1,81 @@
+#include "transfer/pump.h"
+
+#include <algorithm>
+
+#include "transfer/base64.h"
+#include "transfer/line.h"
+#include "transfer/result.h"
+
+namespace zv {
+
+namespace {
+
+constexpr size_t line_bytes = 48;
+constexpr size_t line_text = base64_length(line_bytes) + 2;  // CR LF included
+
+// The next piece of a count, at most `size`.
+size_t piece_of(int64_t count, size_t size) {
+  return static_cast<size_t>(std::clamp<int64_t>(count, 0, static_cast<int64_t>(size)));
+}
+
+// Sets the bytes out in lines, one at least; gives the length of the text.
+size_t put_lines(std::span<const char> bytes, char* text) {
+  const auto* const data = reinterpret_cast<const unsigned char*>(bytes.data());
+  char* end = text;
+  size_t done = 0;
+  do {
+    const size_t piece = std::min(line_bytes, bytes.size() - done);
+    base64_encode(data + done, piece, end);
+    end += base64_length(piece);
+    *end++ = '\r';
+    *end++ = '\n';
+    done += piece;
+  } while (done < bytes.size());
+  return static_cast<size_t>(end - text);
+}
+
+}  // namespace
+
+int recv_to_file(platform::Socket socket, FILE* file, std::span<char> block, int64_t count) {
+  for (;;) {
+    const int64_t received = platform::socket_receive(socket, block.data(), block.size());
+    if (received < 0) return source_failed;
+    const size_t size = static_cast<size_t>(received);
+    if (std::fwrite(block.data(), 1, size, file) != size) return destination_failed;
+    count -= received;
+    if (count == 0) return copied;
+    if (received == 0 || count < 0) return source_failed;
+  }
+}
+
+int send_from_file(platform::Socket socket, FILE* file, std::span<char> block, int64_t count) {
+  while (count > 0) {
+    const size_t size = piece_of(count, block.size());
+    if (std::fread(block.data(), 1, size, file) != size) return source_failed;
+    if (!send_all(socket, {block.data(), size})) return destination_failed;
+    count -= static_cast<int64_t>(size);
+  }
+  return copied;
+}
+
+int send_base64_file(platform::Socket socket, FILE* file, std::span<char> block, int64_t count) {
+  // As many lines leave in one send as the block holds beside the bytes they are made of.
+  const size_t lines = block.size() / (line_text + line_bytes);
+  const std::span<char> bytes = block.last(lines * line_bytes);
+  do {
+    const size_t wanted = piece_of(count, bytes.size());
+    const size_t got = std::fread(bytes.data(), 1, wanted, file);
+    const bool complete = got == wanted;
+    // The whole lines before a read that came short still leave.
+    const size_t size = complete ? got : got - got % line_bytes;
+    if (complete || size != 0) {
+      const size_t length = put_lines(bytes.first(size), block.data());
+      if (!send_all(socket, {block.data(), length})) return destination_failed;
+    }
+    if (!complete) return source_failed;
+    count -= static_cast<int64_t>(size);
+  } while (count > 0);
+  return copied;
+}
+
+}  // namespace zv
