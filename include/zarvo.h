@@ -472,20 +472,210 @@ int zv_strpat(const char* text, const char* pattern);
  * String lists
  */
 
-int zv_strlist(char*** out, const char* text, int sep);
-int zv_strlist_len(char** list);
-int zv_strlist_free(char** list, int n);
-int zv_strlist_insert(char*** list, int n, int pos, const char* s);
-char* zv_strlist_remove(char** list, int n, int pos);
-int zv_strlist_replace(char** list, int pos, const char* s);
-int zv_strlist_cat(char*** list, int count, char** other, int other_count);
-int zv_strlist_idx(char** list, int n, const char* s);
-int zv_strlist_iidx(char** list, int n, const char* s);
-int zv_strlist_cmp(const char** a, const char** b);
-int zv_strlist_icmp(const char** a, const char** b);
-int zv_strlist_set(char** list, int n);
-int zv_strlist_iset(char** list, int n);
-int zv_strlist_reduce(char*** list, int n, int pos);
+/**
+ * @defgroup strlist String lists
+ * The one container that the whole interface hands around.
+ *
+ * A string list is a heap array of heap texts with a NULL entry behind the last: walk it, index it,
+ * sort it with qsort() as it lies. Whoever holds the list owns the array and the texts, and gives
+ * both back with zv_strlist_free(). The empty list is an array with only the NULL in it, not a NULL
+ * pointer. The array has no room to spare: where it may move, functions take its address.
+ *
+ * Most functions take a count `n` of the entries, which saves counting them again; a negative `n`
+ * counts them up to the NULL. A count above the real one is not noticed. Positions begin at 0.
+ *
+ * @code
+ * char** names;
+ * int n = zv_strlist(&names, "b;a;B;", ';');
+ * n -= zv_strlist_iset(names, n);
+ * if (zv_strlist_insert(&names, n, 0, "first")) ++n;
+ * for (char** name = names; *name; ++name) puts(*name);  // first b a
+ * zv_strlist_free(names, n);
+ * @endcode
+ * @{
+ */
+
+/**
+ * Split a text into a new list.
+ *
+ * Every piece of the text must be ended by the separator, the last one too: "a;b;" gives two
+ * entries, "a;b" only the first. Two separators side by side give an empty entry.
+ *
+ * @param out  receives the list, or NULL when memory ran out. What it held before is not freed.
+ * @param text the text, or NULL for the empty list.
+ * @param sep  the separator; 0 when `text` is a zero-separated sequence, each of whose texts
+ *             becomes an entry.
+ * @return the number of entries; -1 when memory ran out.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_strlist(char*** out, const char* text, int sep);
+
+/**
+ * Count the entries of a list.
+ *
+ * @param list the list.
+ * @return how many entries lie before the NULL.
+ * @par Thread safety
+ *   Safe while no thread changes the list.
+ */
+ZV_API int zv_strlist_len(char** list);
+
+/**
+ * Give a list and its texts back.
+ *
+ * @param list the list, or NULL, which does nothing.
+ * @param n    how many entries to free before the array, negative for all.
+ * @return 0, always.
+ * @par Thread safety
+ *   Safe while no other thread uses the list.
+ */
+ZV_API int zv_strlist_free(char** list, int n);
+
+/**
+ * Insert a copy of a text into a list.
+ *
+ * @param list the list's variable, changed to the array's new address. It may hold NULL when `n`
+ *             is 0.
+ * @param n    the number of entries, negative to count them.
+ * @param pos  the position of the new entry, at most the number of entries; negative to append.
+ * @param s    the text to copy.
+ * @return 1; 0 when memory ran out, and then the list is as it was.
+ * @par Thread safety
+ *   Safe while no other thread uses the list.
+ */
+ZV_API int zv_strlist_insert(char*** list, int n, int pos, const char* s);
+
+/**
+ * Take an entry out of a list.
+ *
+ * @param list the list; its array stays where it is and keeps its size.
+ * @param n    the number of entries, negative to count them.
+ * @param pos  the entry's position, at most the number of entries.
+ * @return the entry's text, which now belongs to the caller and goes back through zv_free(); NULL
+ *         when `pos` is that of the closing NULL.
+ * @par Thread safety
+ *   Safe while no other thread uses the list.
+ */
+ZV_API char* zv_strlist_remove(char** list, int n, int pos);
+
+/**
+ * Put a copy of a text in an entry's place and free what was there.
+ *
+ * @param list the list.
+ * @param pos  the entry's position, below the number of entries.
+ * @param s    the text to copy.
+ * @return 1; 0 when memory ran out, and then the entry is as it was.
+ * @par Thread safety
+ *   Safe while no other thread uses the list.
+ */
+ZV_API int zv_strlist_replace(char** list, int pos, const char* s);
+
+/**
+ * Append the entries of one list to another.
+ *
+ * The texts are not copied but move to `list`, while the other array still points at them: release
+ * that array with zv_free() afterwards, never with zv_strlist_free().
+ *
+ * @param list        the list's variable, changed to the array's new address. It may hold NULL when
+ *                    `count` is 0.
+ * @param count       its number of entries, negative to count them.
+ * @param other       the list to append.
+ * @param other_count its number of entries, negative to count them.
+ * @return the number of entries now; -1 when memory ran out, and then both lists are as they were.
+ * @par Thread safety
+ *   Safe while no other thread uses the lists.
+ */
+ZV_API int zv_strlist_cat(char*** list, int count, char** other, int other_count);
+
+/**
+ * Find an entry.
+ *
+ * @param list the list.
+ * @param n    the number of entries, negative to count them.
+ * @param s    the text to find.
+ * @return the position of the first entry that equals it; -1 when there is none.
+ * @par Thread safety
+ *   Safe while no thread changes the list.
+ */
+ZV_API int zv_strlist_idx(char** list, int n, const char* s);
+
+/**
+ * Find an entry without regard to case, as zv_stricmp() compares.
+ *
+ * @param list the list.
+ * @param n    the number of entries, negative to count them.
+ * @param s    the text to find.
+ * @return the position of the first entry that equals it; -1 when there is none.
+ * @par Thread safety
+ *   Safe while no thread changes the list.
+ */
+ZV_API int zv_strlist_iidx(char** list, int n, const char* s);
+
+/**
+ * Compare two entries, for qsort() over a list's array.
+ *
+ * @param a points at one entry.
+ * @param b points at the other.
+ * @return -1, 0 or 1, as the bytes of the one, read as unsigned values, sort before, with or behind
+ *         those of the other.
+ * @par Thread safety
+ *   Safe while no thread changes the texts.
+ */
+ZV_API int zv_strlist_cmp(const char** a, const char** b);
+
+/**
+ * Compare two entries without regard to case, for qsort() over a list's array.
+ *
+ * @param a points at one entry.
+ * @param b points at the other.
+ * @return below 0, 0 or above 0, as zv_stricmp() compares.
+ * @par Thread safety
+ *   Safe while no thread changes the texts.
+ */
+ZV_API int zv_strlist_icmp(const char** a, const char** b);
+
+/**
+ * Remove every entry that equals an earlier one.
+ *
+ * The first of each stays, and the order of those that stay is kept. The array keeps its size.
+ *
+ * @param list the list.
+ * @param n    the number of entries, negative to count them.
+ * @return how many entries were removed. Cannot fail; without memory for an index it takes longer.
+ * @par Thread safety
+ *   Safe while no other thread uses the list.
+ */
+ZV_API int zv_strlist_set(char** list, int n);
+
+/**
+ * Remove every entry that equals an earlier one without regard to case, as zv_stricmp() compares.
+ *
+ * The first written form of each stays, and the order of those that stay is kept. The array keeps
+ * its size.
+ *
+ * @param list the list.
+ * @param n    the number of entries, negative to count them.
+ * @return how many entries were removed. Cannot fail; without memory for an index it takes longer.
+ * @par Thread safety
+ *   Safe while no other thread uses the list.
+ */
+ZV_API int zv_strlist_iset(char** list, int n);
+
+/**
+ * Keep one entry of a list and free all others.
+ *
+ * @param list the list's variable, changed to the new list. Pointers into the old one are no longer
+ *             valid.
+ * @param n    the number of entries, negative to count them.
+ * @param pos  the position of the entry to keep, below the number of entries.
+ * @return 1, the number of entries now. Needs no memory and cannot fail.
+ * @par Thread safety
+ *   Safe while no other thread uses the list.
+ */
+ZV_API int zv_strlist_reduce(char*** list, int n, int pos);
+
+/** @} */
 
 /* ================================================================================================
  * Paths
