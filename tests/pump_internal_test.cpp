@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <functional>
+#include <initializer_list>
 #include <string>
 #include <vector>
 
@@ -16,6 +17,7 @@ namespace {
 
 constexpr zv::platform::Address loopback = {{127, 0, 0, 1}};
 
+using Sizes = std::initializer_list<size_t>;
 using Script = std::function<void(scripted::Peer&)>;
 
 // Runs a pump with a socket that leads to the script, beside it or behind it; gives its result.
@@ -88,7 +90,7 @@ std::string pattern(size_t size) {
 
 TEST(Pump, SendsTheCount) {
   const ScratchFolder folder;
-  for (const size_t size : {0, 1, 15, 16, 17, 100000}) {
+  for (const size_t size : Sizes{0, 1, 15, 16, 17, 100000}) {
     SCOPED_TRACE(size);
     const std::string content = pattern(size);
     const zv::StreamPtr file(std::fopen(folder.make_file("f", content).c_str(), "rb"));
@@ -104,7 +106,7 @@ TEST(Pump, SendsTheCount) {
 
 TEST(Pump, SendsBase64Lines) {
   const ScratchFolder folder;
-  for (const size_t size : {0, 1, 47, 48, 49, 96, 100, 4800, 5001}) {
+  for (const size_t size : Sizes{0, 1, 47, 48, 49, 96, 100, 4800, 5001}) {
     SCOPED_TRACE(size);
     const std::string content = pattern(size);
     std::string lines = size == 0 ? "\r\n" : "";
@@ -114,7 +116,7 @@ TEST(Pump, SendsBase64Lines) {
           zv::base64_encode(bytes, std::min<size_t>(48, size - at), nullptr));
       lines.append(line.get()).append("\r\n");
     }
-    for (const size_t block_size : {114, 300, 4096}) {
+    for (const size_t block_size : Sizes{114, 300, 4096}) {
       const zv::StreamPtr file(std::fopen(folder.make_file("f", content).c_str(), "rb"));
       std::vector<char> block(block_size);
       std::string got;
@@ -150,7 +152,7 @@ TEST(Pump, SendFailures) {
 // The whole lines before the point where a file proves too short are sent, and no more.
 TEST(Pump, ShortFileSendsItsWholeLines) {
   const ScratchFolder folder;
-  for (const size_t size : {0, 47, 48, 100}) {
+  for (const size_t size : Sizes{0, 47, 48, 100}) {
     const zv::StreamPtr file(std::fopen(folder.make_file("f", pattern(size)).c_str(), "rb"));
     std::vector<char> block(4096);
     std::string got;

@@ -2,6 +2,7 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
+#include <initializer_list>
 #include <string>
 
 #include "fixtures/scripted_server.h"
@@ -11,6 +12,7 @@
 namespace {
 
 namespace fs = std::filesystem;
+using Sizes = std::initializer_list<size_t>;
 
 int copy(const std::string& from, const std::string& to) {
   const int before = scripted::open_handles();
@@ -27,7 +29,7 @@ std::string pattern(size_t size) {
 
 TEST(CopyLocal, EverySize) {
   const ScratchFolder folder;
-  for (const size_t size : {0, 1, 511, 512, 513, 65535, 65536, 65537, 300000}) {
+  for (const size_t size : Sizes{0, 1, 511, 512, 513, 65535, 65536, 65537, 300000}) {
     SCOPED_TRACE(size);
     const std::string from = folder.make_file("from", pattern(size));
     folder.make_file("to", "what was there before");
@@ -210,7 +212,7 @@ TEST(HttpGet, RequestsAndBrokenConnections) {
 TEST(HttpGet, DestinationThatCannotBeWritten) {
   if (!fs::exists("/dev/full")) GTEST_SKIP() << "there is no device that is always full";
   // Along with the header, behind it, and small enough to be found out only at the close.
-  for (const size_t size : {5, 500000}) {
+  for (const size_t size : Sizes{5, 500000}) {
     scripted::Server server([size](scripted::Peer& peer) {
       peer.receive_until("\r\n\r\n");
       peer.send("HTTP/1.0 200 OK\r\nContent-Length: " + std::to_string(size) + "\r\n\r\n");
