@@ -946,8 +946,35 @@ ZV_API size_t zv_username(char* buf, size_t size);
  */
 ZV_API size_t zv_hostname(char* buf, size_t size);
 
-int zv_putenv_private(const char* name, const char* value, int append);
-char* zv_getenv_private(const char* name);
+/**
+ * Set, append to or remove a variable of the private environment, or clear it.
+ *
+ * Names are looked up as a whole and without regard to case, as the locale has it when the first
+ * variable is made. The process environment is neither read nor changed. The library itself reads
+ * the variables that name plugin folders.
+ *
+ * @param name   the variable, or NULL to remove all of them.
+ * @param value  the value, or NULL to remove the variable, which need not exist.
+ * @param append 0 to give the variable this value alone; otherwise the value is added behind those
+ *               that it has, unless it is one of them.
+ * @return 1; 0 when memory ran out, or when the name or the value holds the byte 0x1E. Then nothing
+ *         has changed, except that a variable to be set anew is gone when memory ran out.
+ * @par Thread safety
+ *   Safe from any thread: holds the private environment's own lock.
+ */
+ZV_API int zv_putenv_private(const char* name, const char* value, int append);
+
+/**
+ * Read a variable of the private environment.
+ *
+ * @param name the variable, in any case.
+ * @return its values, each ended by a NUL, with one more NUL behind the last, so that read as one
+ *         text it is the first value: a block to be given back with zv_free(). NULL when there is
+ *         no such variable or memory ran out.
+ * @par Thread safety
+ *   Safe from any thread: holds the private environment's own lock. The block is the caller's own.
+ */
+ZV_API char* zv_getenv_private(const char* name);
 
 /** @} */
 

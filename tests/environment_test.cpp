@@ -1,0 +1,156 @@
+// The private environment.
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <string>
+#include <thread>
+#include <vector>
+
+#include "failing_allocation.h"
+#include "zarvo.h"
+
+namespace {
+
+// The values of a variable, '|' behind each; "none" when it is not there.
+std::string get(const char* name) {
+  char* const block = zv_getenv_private(name);
+  if (block == nullptr) return "none";
+  std::string values;
+  for (const char* value = block; *value != '\0'; value += std::strlen(value) + 1)
+    values += std::string(value) + '|';
+  zv_free(block);
+  return values;
+}
+
+class Environment : public testing::Test {
+ protected:
+  void SetUp() override { zv_putenv_private(nullptr, nullptr, 0); }
+  void TearDown() override { zv_putenv_private(nullptr, nullptr, 0); }
+};
+
+TEST_F(Environment, PutAndGet) {
+  EXPECT_EQ(get("A"), "none");
+  const struct {
+    const char* name;
+    const char* value;
+    int append;
+    int result;
+    const char* values;  // of the variable afterwards
+  } steps[] = {
+      {"A", nullptr, 0, 1, "none"},   {"A", "x", 0, 1, "x|"},
+      {"a", "y", 1, 1, "x|y|"},       {"A", "x", 1, 1, "x|y|"},
+      {"A", "X", 1, 1, "x|y|X|"},     {"A", "x|y", 1, 1, "x|y|X|x|y|"},
+      {"AB", "z", 1, 1, "z|"},        {"", "empty name", 0, 1, "empty name|"},
+      {"A", "alone", 0, 1, "alone|"}, {"A", "bad\x1E", 1, 0, "alone|"},
+      {"A", "\x1E", 0, 0, "alone|"},  {"\x1E", nullptr, 0, 0, "none"},
+      {"ab", nullptr, 1, 1, "none"},  {"A", "one more", 1, 1, "alone|one more|"},
+  };
+  for (const auto& step : steps) {
+    SCOPED_TRACE(std::string(step.name) + "=" + (step.value != nullptr ? step.value : "(none)"));
+    EXPECT_EQ(zv_putenv_private(step.name, step.value, step.append), step.result);
+    EXPECT_EQ(get(step.name), step.values);
+  }
+  EXPECT_EQ(get(""), "empty name|");
+  EXPECT_EQ(zv_putenv_private(nullptr, "ignored\x1E", 1), 1);
+  EXPECT_EQ(get("A"), "none");
+}
+
+TEST_F(Environment, EmptyValuesAreKept) {
+  zv_putenv_private("A", "", 0);
+  zv_putenv_private("A", "", 1);
+  zv_putenv_private("A", "b", 1);
+  char* const block = zv_getenv_private("a");
+  EXPECT_EQ(std::string(block, 4), std::string("\0b\0\0", 4));
+  zv_putenv_private("A", "changed", 0);
+  EXPECT_STREQ(block + 1, "b");
+  zv_free(block);
+}
+
+TEST_F(Environment, ManyVariables) {
+  constexpr int count = 2000;
+  const auto name = [](int i) { return "Name" + std::to_string(i); };
+  for (int i = 0; i < count; ++i) zv_putenv_private(name(i).c_str(), name(i).c_str(), 0);
+  for (int i = 0; i < count; i += 3) zv_putenv_private(name(i).c_str(), nullptr, 0);
+  for (int i = 1; i < count; i += 3) zv_putenv_private(name(i).c_str(), "more", 1);
+  for (int i = 0; i < count; ++i) {
+    const std::string expected[] = {"none", name(i) + "|more|", name(i) + "|"};
+    std::string other_case = name(i);
+    zv_strupr(other_case.data());
+    ASSERT_EQ(get(other_case.c_str()), expected[i % 3]);
+  }
+}
+
+// As many variables as there are buckets, so that one more also asks for more of those.
+void fill_table() {
+  zv_putenv_private(nullptr, nullptr, 0);
+  for (int i = 0; i < 16; ++i) zv_putenv_private(std::to_string(i).c_str(), "kept", 0);
+}
+
+TEST_F(Environment, OutOfMemory) {
+  const std::string long_value(100, 'v');
+  const struct {
+    const char* name;
+    const char* value;
+    int append;
+    int failures;        // allocations that can fail
+    const char* before;  // what a failure leaves
+    std::string after;
+  } cases[] = {
+      {"7", long_value.c_str(), 1, 1, "kept|", "kept|" + long_value + "|"},
+      {"7", "anew", 0, 2, "none", "anew|"},
+      {"new", "v", 0, 3, "none", "v|"},
+      {"new", "v", 1, 3, "none", "v|"},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.name);
+    int result = -1;
+    const auto put = [&] { result = zv_putenv_private(c.name, c.value, c.append); };
+    fill_table();
+    EXPECT_EQ(fail_each_allocation(put,
+                                   [&] {
+                                     EXPECT_EQ(get(c.name), result == 1 ? c.after : c.before);
+                                     EXPECT_EQ(get("8"), "kept|");
+                                     fill_table();
+                                   }),
+              c.failures);
+    EXPECT_EQ(result, 1);
+    EXPECT_EQ(get(c.name), c.after);
+  }
+
+  zv_putenv_private(nullptr, nullptr, 0);
+  const FailingAllocation failing(0);
+  EXPECT_EQ(zv_putenv_private("A", "v", 0), 0);
+  EXPECT_TRUE(failing.happened());
+  EXPECT_EQ(get("A"), "none");
+}
+
+TEST_F(Environment, NoMemoryForTheCopy) {
+  zv_putenv_private("A", "v", 0);
+  const FailingAllocation failing(0);
+  EXPECT_EQ(zv_getenv_private("A"), nullptr);
+  EXPECT_EQ(get("A"), "v|");
+}
+
+// Each thread sees its own variable as it left it, and the shared one whole.
+TEST_F(Environment, EightThreads) {
+  const auto work = [](int thread) {
+    const std::string own = "own" + std::to_string(thread);
+    for (int round = 0; round < 300; ++round) {
+      const std::string value = std::to_string(round);
+      zv_putenv_private(own.c_str(), value.c_str(), 0);
+      zv_putenv_private("SHARED", own.c_str(), round % 50);
+      zv_putenv_private((own + value).c_str(), "made", 0);
+      if (round > 10) zv_putenv_private((own + std::to_string(round - 10)).c_str(), nullptr, 0);
+      zv_putenv_private(own.c_str(), "last", 1);
+      ASSERT_EQ(get(own.c_str()), value + "|last|");
+      const std::string shared = get("shared");
+      ASSERT_EQ(shared.substr(0, 3), "own");
+      ASSERT_EQ(shared.size() % 5, 0u);
+    }
+  };
+  std::vector<std::thread> threads;
+  for (int i = 0; i < 8; ++i) threads.emplace_back(work, i);
+  for (std::thread& thread : threads) thread.join();
+}
+
+}  // namespace
