@@ -852,8 +852,44 @@ ZV_API int zv_extract_filename(const char* path, char* out, size_t size);
 ZV_API int zv_extract_extension(const char* path, char* out, size_t size);
 
 int zv_normalize_path(char* path);
-int zv_absolute(const char* path, const char* base, char* out, size_t size);
-int zv_relative(const char* path, const char* base, char* out, size_t size);
+/**
+ * Make a relative path absolute.
+ *
+ * Only the text is looked at: "." and ".." in front of the path are worked off against the base,
+ * and those behind its first other component stay where they are. The path is not tested for being
+ * relative, and an absolute one would be appended like any component: ask zv_ispath_relative()
+ * first.
+ *
+ * @param path the path, in canonical form.
+ * @param base the folder it is relative to, in canonical form; NULL for the working directory.
+ * @param out  receives the result, cut to `size` - 1 characters; may be `path` itself.
+ * @param size bytes in `out`.
+ * @return 1 if `out` is not empty; 0 on failure: the path climbs above the base's root and `out` is
+ *         empty, or `out` is untouched because the base is empty, the working directory cannot be
+ *         had or the result has more than 319 characters.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers.
+ */
+ZV_API int zv_absolute(const char* path, const char* base, char* out, size_t size);
+
+/**
+ * Express a path relative to a folder.
+ *
+ * Only the text is looked at, without regard to case. Two shares of one server count as two folders
+ * of one root. A relative path can be expressed relative to another with which it shares its first
+ * component.
+ *
+ * @param path the path, in canonical form.
+ * @param base the folder, in canonical form; NULL for the working directory.
+ * @param out  receives the result, cut to `size` - 1 characters; may be `path` itself.
+ * @param size bytes in `out`.
+ * @return 1, `out` being empty where the path is the base itself; 0 on failure, `out` holding a
+ *         copy of the path: the two share no root, one of them is empty, the working directory
+ *         cannot be had or the result has more than 319 characters.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers.
+ */
+ZV_API int zv_relative(const char* path, const char* base, char* out, size_t size);
 
 int zv_pathmap(const char* from, const char* to);
 void zv_pathmap_clear(void);

@@ -4,6 +4,8 @@
 #include <cstring>
 #include <string>
 
+#include "environment.h"
+#include "scratch_folder.h"
 #include "zarvo.h"
 
 namespace {
@@ -164,6 +166,129 @@ TEST(Path, LongPathsAreCut) {
   const std::string bare_share = "//s/" + std::string(315, 'h');  // has no room for its separator
   EXPECT_EQ(zv_extract_directory(bare_share.c_str(), out, 400), 0);
   EXPECT_STREQ(out, "");
+}
+
+struct ResolveCase {
+  const char* path;
+  const char* base;
+  int result;
+  const char* out;
+};
+
+using Resolve = int (*)(const char* path, const char* base, char* out, size_t size);
+
+// Also with `out` being the path's own buffer.
+void expect_resolved(Resolve resolve, const ResolveCase& c) {
+  SCOPED_TRACE(std::string(c.path) + " against " + c.base);
+  char out[64] = "untouched";
+  EXPECT_EQ(resolve(c.path, c.base, out, sizeof out), c.result);
+  EXPECT_STREQ(out, c.out);
+  if (std::strcmp(c.out, "untouched") == 0) return;
+  std::strcpy(out, c.path);
+  EXPECT_EQ(resolve(out, c.base, out, sizeof out), c.result);
+  EXPECT_STREQ(out, c.out);
+}
+
+TEST(Path, Absolute) {
+  const ResolveCase cases[] = {
+      {"../lib/x.dll", "D:/app/bin", 1, "D:/app/lib/x.dll"},
+      {"./a/b", "D:/w", 1, "D:/w/a/b"},
+      {"", "D:/w", 1, "D:/w"},
+      {".", "D:/w/", 1, "D:/w"},
+      {"x", "//srv/sh", 1, "//srv/sh/x"},
+      {"..", "//srv/sh/a", 1, "//srv/sh/"},
+      {"../..", "//srv/sh/a", 0, ""},
+      {"a", "D:/", 1, "D:/a"},
+      {"a/", "/", 1, "/a"},
+      {"../x", "D:/", 0, ""},
+      {"./././a", "D:/w", 1, "D:/w/a"},
+      {"a/./b/../d", "D:/w", 1, "D:/w/a/./b/../d"},
+      {".././a", "D:/w/v", 1, "D:/w/./a"},
+      {"../..", "D:/a/b", 1, "D:/"},
+      {"../../..", "D:/a/b", 0, ""},
+      {"../x", "a/b", 1, "a/x"},
+      {"../x", "a", 0, ""},
+      {"/x", "D:/w", 1, "D:/w//x"},  // nothing tests for a relative path
+      {"x", "D:", 1, "D:/x"},
+      {"", "D:", 1, "D:/"},
+      {"a//lost", "/w//lost", 1, "/w/a"},
+      {"x", "", 0, "untouched"},
+      {"x", "//", 0, "untouched"},
+  };
+  for (const ResolveCase& c : cases) expect_resolved(zv_absolute, c);
+}
+
+TEST(Path, Relative) {
+  const ResolveCase cases[] = {
+      {"D:/a/b/f.txt", "D:/a", 1, "b/f.txt"},
+      {"D:/a/x", "D:/a/b/e", 1, "../../x"},
+      {"D:/a/b", "D:/a/b/e", 1, ".."},
+      {"D:/A/b", "d:/a", 1, "b"},
+      {"D:/a", "D:/a/", 1, ""},
+      {"D:/", "D:/a", 1, ".."},
+      {"D:/ab", "D:/a", 1, "../ab"},
+      {"/x", "/", 1, "x"},
+      {"/", "/", 1, ""},
+      {"/x/D:", "/x", 1, "D:/"},  // what is left is a root once it is joined
+      {"//srv/a/x", "//SRV/b/y", 1, "../../a/x"},
+      {"//srv/a", "//srv/b", 1, "../a"},
+      {"//srv/a/", "//srv/A", 1, ""},
+      {"//srv/a/x", "//srv/a", 1, "x"},
+      {"//srv/a", "//srw/a", 0, "//srv/a"},
+      {"//srv/a", "//sr/a", 0, "//srv/a"},
+      {"//srv/a", "/srv/a", 0, "//srv/a"},
+      {"D:/a", "E:/a", 0, "D:/a"},
+      {"D:/a/", "/a", 0, "D:/a/"},
+      {"a/b", "a/e", 1, "../b"},
+      {"a/b", "/a", 0, "a/b"},
+      {"x", "y", 0, "x"},
+      {"", "D:/a", 0, ""},
+      {"x", "", 0, "x"},
+  };
+  for (const ResolveCase& c : cases) expect_resolved(zv_relative, c);
+}
+
+TEST(Path, ResolvedAgainstTheWorkingDirectory) {
+  const ScratchFolder scratch;
+  const WorkingDirectory inside(scratch.make_folder("a/b"));
+  char out[ZV_PATH_MAX];
+  EXPECT_EQ(zv_absolute("../x", nullptr, out, sizeof out), 1);
+  EXPECT_EQ(out, scratch.path("a/x"));
+  EXPECT_EQ(zv_relative(out, nullptr, out, sizeof out), 1);
+  EXPECT_STREQ(out, "../x");
+}
+
+TEST(Path, ResolvedResultsAreCutOrRefused) {
+  char out[8] = "";
+  EXPECT_EQ(zv_absolute("lib", "/usr/local", out, sizeof out), 1);
+  EXPECT_STREQ(out, "/usr/lo");
+  EXPECT_EQ(zv_relative("/usr/local", "/usr/local/lib/x", out, 3), 1);
+  EXPECT_STREQ(out, "..");
+  EXPECT_EQ(zv_relative("/usr/local", "D:/", out, 5), 0);
+  EXPECT_STREQ(out, "/usr");
+  EXPECT_EQ(zv_absolute("lib", "/usr", out, 1), 0);
+
+  // 319 characters fit and one more does not, whether it comes from a name or from climbing.
+  const std::string base = "/" + std::string(300, 'b');
+  for (const bool fits : {true, false}) {
+    const std::string name(fits ? 17 : 18, 'n');
+    char whole[400] = "untouched";
+    EXPECT_EQ(zv_absolute(name.c_str(), base.c_str(), whole, sizeof whole), fits);
+    EXPECT_EQ(whole, fits ? base + "/" + name : "untouched");
+
+    std::string deep;
+    for (int i = 0; i < (fits ? 106 : 107); ++i) deep += "/d";
+    const std::string path = fits ? "/x" : "/y";
+    EXPECT_EQ(zv_relative(path.c_str(), deep.c_str(), whole, sizeof whole), fits);
+    EXPECT_EQ(std::strlen(whole), fits ? 319u : 2u);
+  }
+
+  // The longest list of components there is.
+  std::string most = "a";
+  while (most.size() < 319) most += "/a";
+  char whole[400];
+  EXPECT_EQ(zv_relative((most + "/cut").c_str(), "a", whole, sizeof whole), 1);
+  EXPECT_EQ(whole, most.substr(2));
 }
 
 }  // namespace

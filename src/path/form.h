@@ -3,11 +3,19 @@
 #define ZARVO_PATH_FORM_H
 
 #include <cstddef>
+#include <cstring>
 #include <string_view>
 
 #include "frame/text_buffer.h"
 
 namespace zv {
+
+// The characters of a path that take part: at most 319.
+inline std::string_view path_text(const char* path) {
+  const void* const end = std::memchr(path, '\0', PathBuffer::capacity);
+  return {path, end != nullptr ? static_cast<size_t>(static_cast<const char*>(end) - path)
+                               : PathBuffer::capacity};
+}
 
 // "X:" in front, whatever the character before the colon.
 bool is_dos(std::string_view path);

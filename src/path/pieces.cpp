@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "path/form.h"
+#include "path/output.h"
 #include "zarvo.h"
 
 namespace {
@@ -88,10 +89,5 @@ int zv_extract_filename(const char* path, char* out, size_t size) {
 }
 
 int zv_extract_extension(const char* path, char* out, size_t size) {
-  if (size == 0) return 0;
-  const char* const dot = zv_dot(path);
-  const size_t kept = std::min(std::strlen(dot), size - 1);
-  std::memmove(out, dot, kept);  // `out` may be `path`
-  out[kept] = '\0';
-  return kept != 0;
+  return zv::put(zv_dot(path), out, size);
 }
