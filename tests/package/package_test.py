@@ -9,6 +9,7 @@ import os
 import re
 import shutil
 import subprocess
+import tempfile
 import unittest
 from pathlib import Path
 
@@ -17,12 +18,16 @@ WINDOWS_OWN = {"kernel32.dll", "msvcrt.dll", "advapi32.dll", "ws2_32.dll"}
 
 
 def run(*command, **more):
-    """The output of a command, which must succeed."""
-    done = subprocess.run([str(word) for word in command], stdout=subprocess.PIPE,
-                          stderr=subprocess.STDOUT, text=True, timeout=120, check=False, **more)
+    """The output of a command, which must succeed. It goes to a file: a pipe would stay open as
+    long as the emulator's own processes, which outlive the program."""
+    with tempfile.TemporaryFile("w+") as output:
+        done = subprocess.run([str(word) for word in command], stdout=output,
+                              stderr=subprocess.STDOUT, timeout=120, check=False, **more)
+        output.seek(0)
+        text = output.read()
     if done.returncode != 0:
-        raise AssertionError(f"{' '.join(map(str, command))}: {done.returncode}\n{done.stdout}")
-    return done.stdout
+        raise AssertionError(f"{' '.join(map(str, command))}: {done.returncode}\n{text}")
+    return text
 
 
 class Package(unittest.TestCase):

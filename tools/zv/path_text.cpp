@@ -1,0 +1,13 @@
+// See path_text.h.
+#include "path_text.h"
+
+#include "command.h"
+
+bool tool::PathText::assign(const std::string& path) {
+  if (path.size() >= ZV_PATH_MAX) {
+    complain("a path has at most " + std::to_string(ZV_PATH_MAX - 1) + " characters: " + path);
+    return false;
+  }
+  zv_strncpy(text_, path.c_str(), ZV_PATH_MAX);
+  return true;
+}
