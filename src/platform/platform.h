@@ -59,6 +59,13 @@ FILE* open_unemptied(const char* path);
 bool same_file(FILE* a, FILE* b);
 bool empty_file(FILE* stream);  // true also for what has no length, such as a device
 
+// ---- copy.cpp: file contents that the system moves by itself ------------------------------------
+
+// Copies as much of the rest of one file to another as the system does without the bytes passing
+// through the process, which may be nothing; both streams then stand behind it, and the caller
+// copies on. False when a write failed.
+bool copy_within(FILE* from, FILE* to);
+
 // ---- directory.cpp: searches --------------------------------------------------------------------
 
 enum class EntryKind { unknown, directory, link, other };

@@ -48,12 +48,8 @@ int receive_body(const Connection& connection) {
   const HttpHeader header = read_http_header(socket, connection.buffer.room());
   if (!is_success(header) || header.content_length <= 0) return source_failed;
 
-  const size_t along = static_cast<size_t>(header.body_bytes);
-  FILE* const file = connection.file.get();
-  if (std::fwrite(connection.buffer.room().data(), 1, along, file) != along)
-    return destination_failed;
-  const int64_t rest = header.content_length - header.body_bytes;
-  return recv_to_file(socket, file, connection.buffer.block(), rest);
+  return recv_to_file(socket, connection.file.get(), connection.buffer.block(),
+                      header.content_length, static_cast<size_t>(header.body_bytes));
 }
 
 }  // namespace

@@ -18,6 +18,23 @@ size_t piece_of(int64_t count, size_t size) {
   return static_cast<size_t>(std::clamp<int64_t>(count, 0, static_cast<int64_t>(size)));
 }
 
+// Receives behind the bytes that the block has until it is full, so that whole blocks are written,
+// or holds the count. False when the peer closed or the connection failed.
+bool fill_block(platform::Socket socket, std::span<char> block, int64_t count, size_t& have) {
+  while (have < block.size() && static_cast<int64_t>(have) < count) {
+    const std::span<char> room = block.last(block.size() - have);
+    const int64_t received = platform::socket_receive(socket, room.data(), room.size());
+    if (received <= 0) return false;
+    have += static_cast<size_t>(received);
+  }
+  return true;
+}
+
+bool peer_closes(platform::Socket socket) {
+  char byte;
+  return platform::socket_receive(socket, &byte, 1) == 0;
+}
+
 // Sets the bytes out in lines, one at least; gives the length of the text.
 size_t put_lines(std::span<const char> bytes, char* text) {
   const auto* const data = reinterpret_cast<const unsigned char*>(bytes.data());
@@ -36,16 +53,19 @@ size_t put_lines(std::span<const char> bytes, char* text) {
 
 }  // namespace
 
-int recv_to_file(platform::Socket socket, FILE* file, std::span<char> block, int64_t count) {
-  for (;;) {
-    const int64_t received = platform::socket_receive(socket, block.data(), block.size());
-    if (received < 0) return source_failed;
-    const size_t size = static_cast<size_t>(received);
-    if (std::fwrite(block.data(), 1, size, file) != size) return destination_failed;
-    count -= received;
-    if (count == 0) return copied;
-    if (received == 0 || count < 0) return source_failed;
-  }
+int recv_to_file(platform::Socket socket, FILE* file, std::span<char> block, int64_t count,
+                 size_t have) {
+  const bool all_there = static_cast<int64_t>(have) >= count;
+  bool open = true;
+  do {
+    open = fill_block(socket, block, count, have);
+    if (std::fwrite(block.data(), 1, have, file) != have) return destination_failed;
+    count -= static_cast<int64_t>(have);
+    have = 0;
+  } while (open && count > 0);
+
+  const bool exact = count == 0 && (!all_there || peer_closes(socket));
+  return exact ? copied : source_failed;
 }
 
 int send_from_file(platform::Socket socket, FILE* file, std::span<char> block, int64_t count) {

@@ -10,9 +10,11 @@
 
 namespace zv {
 
-// Receives exactly `count` bytes: 0; -3 when a receive fails, or the peer closes too early or sends
-// too much; -4 when a write fails. A count of 0 waits for the peer to close.
-int recv_to_file(platform::Socket socket, FILE* file, std::span<char> block, int64_t count);
+// Receives until exactly `count` bytes are there, of which the block has the first ones already,
+// and writes them: 0; -3 when a receive fails, or the peer closes too early or sends too much; -4
+// when a write fails. When no more bytes are wanted, the peer must close.
+int recv_to_file(platform::Socket socket, FILE* file, std::span<char> block, int64_t count,
+                 size_t have = 0);
 
 // Sends the file's next `count` bytes: 0; -3 when the file ends or fails before; -4 when a send
 // fails.
