@@ -458,15 +458,159 @@ ZV_API char* zv_stristr(const char* s, const char* needle);
 
 /** @} */
 
-int zv_strreplstr(char* s, const char* needle, const char* repl);
-int zv_strireplstr(char* s, const char* needle, const char* repl);
-int zv_strbrkt(char* s, char open, char close);
-int zv_strubrkt(char* s, int open, int close);
-int zv_strsynch(char* s, const char* model);
-size_t zv_strtowcs(uint16_t* dst, const char* src);
-size_t zv_wcstostr(char* dst, const uint16_t* src);
+/**
+ * @defgroup replacement Replacement, brackets, case of names, wide text
+ * Further edits of a text where it lies, and texts of 16-bit units.
+ *
+ * Nothing is allocated and no size is tested: where a text grows, the caller has the room.
+ *
+ * @code
+ * char path[80] = "a//b//readme.txt";
+ * zv_strreplstr(path, "//", "/");        // "a/b/readme.txt"
+ * zv_strsynch(path, "NOTES.DOC");        // "a/b/README.TXT"
+ * zv_strbrkt(path, '"', '"');            // "\"a/b/README.TXT\""
+ * @endcode
+ * @{
+ */
 
-int zv_strpat(const char* text, const char* pattern);
+/**
+ * Replace every occurrence of a text within another.
+ *
+ * Occurrences are found from left to right and do not overlap; what is put in is never searched.
+ *
+ * @param s      the text to edit, with room for what it grows by at each occurrence.
+ * @param needle the text to replace. An empty one is never found.
+ * @param repl   the text to put in its place. Neither may overlap `s`.
+ * @return 1 if anything was replaced, else 0.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts.
+ */
+ZV_API int zv_strreplstr(char* s, const char* needle, const char* repl);
+
+/**
+ * Replace every occurrence of a text within another, found without regard to case as zv_stristr()
+ * finds it.
+ *
+ * @param s      the text to edit, with room for what it grows by at each occurrence.
+ * @param needle the text to replace. An empty one is never found.
+ * @param repl   the text to put in its place, exactly as it is. Neither may overlap `s`.
+ * @return 1 if anything was replaced, else 0.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts, while no thread changes the locale.
+ */
+ZV_API int zv_strireplstr(char* s, const char* needle, const char* repl);
+
+/**
+ * Put a character in front of a text and another behind it.
+ *
+ * @param s     the text, in a buffer of at least its length + 3 bytes.
+ * @param open  the character to go in front, a bracket or a quote or any other.
+ * @param close the character to go behind.
+ * @return 2, the number of characters added.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts.
+ */
+ZV_API int zv_strbrkt(char* s, char open, char close);
+
+/**
+ * Take the brackets off a text.
+ *
+ * Both characters must stand where they belong and be two: a lone quote is not a quoted text.
+ *
+ * @param s     the text, edited in place.
+ * @param open  the first character, as the value of a `signed char`.
+ * @param close the last character, as the value of a `signed char`.
+ * @return 2, the number of characters removed; 0 when the text was left as it is.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts.
+ */
+ZV_API int zv_strubrkt(char* s, int open, int close);
+
+/**
+ * Give the name and the extension of a path the letter case of another path's.
+ *
+ * The case of each is told by its first two letters: two upper-case ones mean all upper case, two
+ * lower-case ones all lower case, an upper-case one before a lower-case one a capital first and
+ * lower case behind it. Anything else leaves that part as it is. A model without an extension
+ * rules the whole file name, and folders never change. The extension is the one that zv_dot()
+ * finds.
+ *
+ * @param s     the path, edited in place.
+ * @param model the path to follow.
+ * @return 1 if any character changed, else 0.
+ * @par Thread safety
+ *   Safe from any thread, for distinct texts, while no thread changes the locale.
+ */
+ZV_API int zv_strsynch(char* s, const char* model);
+
+/**
+ * Widen a text to 16-bit units, one for each byte.
+ *
+ * This is not a conversion of encodings: a byte is widened as a signed value, so that 0xE9 becomes
+ * 0xFFE9. zv_wcstostr() undoes it.
+ *
+ * @param dst receives the units and a 0 unit; room for the length of `src` + 1 units.
+ * @param src the text.
+ * @return the number of units before the 0 unit.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers.
+ */
+ZV_API size_t zv_strtowcs(uint16_t* dst, const char* src);
+
+/**
+ * Narrow a text of 16-bit units, each to its low 8 bits.
+ *
+ * @param dst receives the bytes and a NUL; room for as many bytes as `src` has units, and one more.
+ * @param src the units, up to a 0 unit.
+ * @return the number of units converted. A unit whose low bits are 0 counts, though its NUL ends
+ *         the text in `dst` early.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers.
+ */
+ZV_API size_t zv_wcstostr(char* dst, const uint16_t* src);
+
+/** @} */
+
+/**
+ * @defgroup wildcard Wildcard patterns
+ * File names and the like, chosen by a pattern.
+ *
+ * | Element       | Matches                                                               |
+ * |---------------|-----------------------------------------------------------------------|
+ * | `*`           | any characters, also none                                             |
+ * | `?`           | one character                                                         |
+ * | `[abx-z]`     | one character of the set: `a`, `b`, or any from `x` to `z`            |
+ * | `[^abx-z]`    | one character that is not in the set                                  |
+ * | `\` and a byte | that byte, whatever it is; inside a set `\` is a member like others  |
+ * | any other byte | the same byte                                                        |
+ *
+ * A set may hold `]` as its first member and `-` as its first or last. Only `^` negates it. A range
+ * goes by the characters' values, and one that runs backwards holds its first character only.
+ *
+ * Where the bytes of text or set form UTF-8, `*`, `?` and sets take a character as a whole; any
+ * other byte is a character by itself, whose value is the byte's.
+ *
+ * @code
+ * if (zv_strpat(name, "report_[0-9]*.txt")) add(name);
+ * @endcode
+ * @{
+ */
+
+/**
+ * Tell whether a whole text matches a pattern.
+ *
+ * Case counts: to ignore it, turn both into lower case first with zv_strlwr(). Needs no memory, and
+ * no pattern makes it recurse.
+ *
+ * @param text    the text.
+ * @param pattern the pattern. A set without its `]`, or a `\` at the very end, matches nothing.
+ * @return 1 if the text matches, else 0.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_strpat(const char* text, const char* pattern);
+
+/** @} */
 
 /* ================================================================================================
  * String lists

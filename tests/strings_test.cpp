@@ -1,8 +1,9 @@
-// Copies, sequences, edits in place, and comparison without regard to case.
+// Copies, sequences, edits in place, comparison without regard to case, replacement.
 #include <gtest/gtest.h>
 
-#include <climits>
+#include <chrono>
 #include <cstring>
+#include <random>
 #include <string>
 
 #include "guarded.h"
@@ -273,6 +274,148 @@ TEST(NoCase, Search) {
   EXPECT_EQ(zv_strichr(path, '\0'), nullptr);
   EXPECT_EQ(zv_strichr(path, 'x'), nullptr);
   EXPECT_EQ(zv_strichr("", 'x'), nullptr);
+}
+
+struct Replacement {
+  std::string before, needle, repl, after;
+};
+
+void expect_replacement(int (*replace)(char*, const char*, const char*), const Replacement& c) {
+  SCOPED_TRACE("'" + c.before + "': '" + c.needle + "' by '" + c.repl + "'");
+  const size_t grows = c.after.size() - std::min(c.after.size(), c.before.size());
+  Guarded text(c.before, grows);
+  EXPECT_EQ(replace(text.data(), c.needle.c_str(), c.repl.c_str()), c.before != c.after ? 1 : 0);
+  EXPECT_EQ(text.text(), c.after);
+  EXPECT_TRUE(text.intact());
+}
+
+TEST(Replace, Table) {
+  const Replacement exact[] = {
+      {"a-b-d", "-", "--", "a--b--d"},
+      {"a-b-d", "x", "y", "a-b-d"},
+      {"aaa", "a", "aa", "aaaaaa"},
+      {"aaaaa", "aa", "b", "bba"},
+      {"aaaaa", "aa", "aaab", "aaabaaaba"},
+      {"abab", "ab", "", ""},
+      {"a//b////d", "//", "/", "a/b//d"},
+      {"abc", "", "x", "abc"},
+      {"", "a", "b", ""},
+      {"abc", "abcd", "x", "abc"},
+      {"xabx", "ab", "ba", "xbax"},
+      {"aXa", "x", "y", "aXa"},
+  };
+  for (const Replacement& c : exact) expect_replacement(zv_strreplstr, c);
+  const Replacement nocase[] = {
+      {"One ONE one", "one", "2", "2 2 2"},
+      {"One ONE one", "oNE", "Three", "Three Three Three"},
+      {"one", "", "x", "one"},
+  };
+  for (const Replacement& c : nocase) expect_replacement(zv_strireplstr, c);
+
+  Guarded same("aXa");
+  EXPECT_EQ(zv_strreplstr(same.data(), "X", "X"), 1);
+}
+
+// The definition: one occurrence after the other, the search going on behind what was put in.
+std::string replaced(std::string text, const std::string& needle, const std::string& repl) {
+  for (size_t at = 0; (at = text.find(needle, at)) != std::string::npos; at += repl.size())
+    text.replace(at, needle.size(), repl);
+  return text;
+}
+
+TEST(Replace, AgreesWithItsDefinition) {
+  std::mt19937 random(7);
+  const auto text_of = [&](size_t length) {
+    std::string text;
+    while (length-- > 0) text += random() % 3 != 0 ? 'a' : 'b';
+    return text;
+  };
+  for (int i = 0; i < 20000; ++i) {
+    const std::string before = text_of(random() % 24);
+    const std::string needle = text_of(1 + random() % 3);
+    const std::string repl = text_of(random() % 5);
+    if (needle == repl) continue;
+    expect_replacement(zv_strreplstr, {before, needle, repl, replaced(before, needle, repl)});
+    if (HasFailure()) return;
+  }
+}
+
+TEST(Replace, TakesTimeForEachByteOnce) {
+  constexpr size_t times = 20000;
+  std::string before, after;
+  for (size_t i = 0; i < times; ++i) {
+    before += "xa";
+    after += "xyz";
+  }
+  const auto start = std::chrono::steady_clock::now();
+  expect_replacement(zv_strreplstr, {before, "a", "yz", after});
+  expect_replacement(zv_strireplstr, {after, "YZ", "a", before});
+  EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(2));
+}
+
+TEST(Replace, Brackets) {
+  for (const char* inside : {"abc", "", "("}) {
+    Guarded text(inside, 2);
+    EXPECT_EQ(zv_strbrkt(text.data(), '(', '\xE9'), 2);
+    EXPECT_EQ(text.text(), std::string("(") + inside + "\xE9");
+    EXPECT_EQ(zv_strubrkt(text.data(), '(', 0xE9), 0);  // not the value of any character
+    EXPECT_EQ(zv_strubrkt(text.data(), '(', -23), 2);
+    EXPECT_STREQ(text.text(), inside);
+    EXPECT_TRUE(text.intact());
+  }
+  for (const char* kept : {"(abc", "abc)", "(", ")", "", "a()"}) {
+    Guarded text(kept);
+    EXPECT_EQ(zv_strubrkt(text.data(), '(', ')'), 0);
+    EXPECT_STREQ(text.text(), kept);
+  }
+  Guarded quote("\"");
+  EXPECT_EQ(zv_strubrkt(quote.data(), '"', '"'), 0);
+}
+
+TEST(Synch, Table) {
+  const struct {
+    const char *before, *model, *after;
+  } cases[] = {
+      {"dir/readme.txt", "NOTES.DOC", "dir/README.TXT"},
+      {"Data/FILE.TXT", "Report.Doc", "Data/File.Txt"},
+      {"File.TXT", "readme", "file.txt"},
+      {"file", "README.TXT", "FILE"},
+      {"a/b.q", "x9.TXT", "a/b.Q"},
+      {"FILE.TXT", "aBc.tX", "FILE.TXT"},
+      {"FILE.TXT", "aBc.Tx", "FILE.Txt"},
+      {"FILE.TXT", "a.D", "FILE.TXT"},  // one letter shows no style
+      {"FILE.TXT", "name.9x", "file.TXT"},
+      {"dir/", "Name.Txt", "dir/"},
+      {"FILE.TXT", "dir/", "FILE.TXT"},
+      {"DIR.X/.PROFILE", "dir.y/.Px", "DIR.X/.PROFILE"},
+      {"A.B/FILE.", "a.b/name.txt", "A.B/file."},
+      {"a_b.c_d", "AA.AA", "A_B.C_D"},
+      {"", "AA.AA", ""},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(std::string(c.before) + " after " + c.model);
+    Guarded path(c.before);
+    EXPECT_EQ(zv_strsynch(path.data(), c.model), std::strcmp(c.before, c.after) != 0 ? 1 : 0);
+    EXPECT_STREQ(path.text(), c.after);
+    EXPECT_TRUE(path.intact());
+  }
+}
+
+TEST(Wide, BytesAndUnits) {
+  const char text[] = "a\xE9\x80\x7F";
+  const uint16_t expected[] = {'a', 0xFFE9, 0xFF80, 0x7F, 0};
+  uint16_t units[5] = {1, 1, 1, 1, 1};
+  EXPECT_EQ(zv_strtowcs(units, text), 4u);
+  EXPECT_EQ(std::memcmp(units, expected, sizeof expected), 0);
+  Guarded back = Guarded::buffer("", 5);
+  EXPECT_EQ(zv_wcstostr(back.data(), units), 4u);
+  EXPECT_STREQ(back.text(), text);
+
+  const uint16_t wide[] = {0x0141, 0x0100, 'z', 0};
+  EXPECT_EQ(zv_wcstostr(back.data(), wide), 3u);
+  EXPECT_EQ(back.all().substr(0, 4), "A\0z\0"s);
+  EXPECT_EQ(zv_wcstostr(back.data(), wide + 3), 0u);
+  EXPECT_TRUE(back.intact());
 }
 
 }  // namespace
