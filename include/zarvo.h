@@ -995,7 +995,31 @@ ZV_API int zv_extract_filename(const char* path, char* out, size_t size);
  */
 ZV_API int zv_extract_extension(const char* path, char* out, size_t size);
 
-int zv_normalize_path(char* path);
+/**
+ * Bring a path as somebody wrote it into canonical form, in place.
+ *
+ * In this order: white space at both ends goes and each backslash becomes `/`; doubled separators
+ * and "." components behind a separator go, but not a "." that the path begins with; `X:` and
+ * `X:name` are completed with the current folder of that drive, and `/name` with the current drive;
+ * each ".." cancels the component before it; a first component `~` becomes the home folder; each
+ * component `%NAME%` or `$NAME` becomes the value of that variable of the process environment, with
+ * its backslashes turned and the separator at its end removed.
+ *
+ * A value is not normalised again, and since ".." has worked before, `%TEMP%/../x` is `x`. `~name`
+ * is an ordinary component. On Linux, where there are no drives, `/name` stays as it is and `X:`
+ * and `X:name` fail; `X:/name` is text there and stays.
+ *
+ * @param path the path, in a buffer of #ZV_PATH_MAX bytes.
+ * @return 1, `path` being normal, and empty where nothing is left of it; 0 on failure, `path` being
+ *         empty: the drive is not there, the path climbs above its root, there is no home folder,
+ *         or the result has more than 319 characters. 0 also for a variable that is not set: then
+ *         the components before it stand in `path`.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers, while none changes the process environment or a
+ *   current folder.
+ */
+ZV_API int zv_normalize_path(char* path);
+
 /**
  * Make a relative path absolute.
  *

@@ -52,6 +52,16 @@ class WorkingDirectory {
   std::filesystem::path old_;
 };
 
+// Gives a drive such as "C:" a current folder, or takes it back, as Windows remembers it when the
+// process leaves the drive.
+inline void set_drive_folder(const std::string& drive, const char* folder) {
+#ifdef _WIN32
+  SetEnvironmentVariableA(("=" + drive).c_str(), folder);
+#else
+  static_cast<void>(drive), static_cast<void>(folder);
+#endif
+}
+
 #ifdef _WIN32
 // Names a home folder in a registry tree of its own, which stands in for the user's.
 class Home {

@@ -269,7 +269,8 @@ TEST(Path, ResolvedResultsAreCutOrRefused) {
   EXPECT_EQ(zv_absolute("lib", "/usr", out, 1), 0);
 
   // 319 characters fit and one more does not, whether it comes from a name or from climbing.
-  const std::string base = std::string(300, 'b').replace(0, 1, "/");
+  std::string base(300, 'b');
+  base[0] = '/';
   for (const bool fits : {true, false}) {
     const std::string name(fits ? 18 : 19, 'n');
     char whole[400] = "untouched";

@@ -54,8 +54,9 @@ class Components {
   Piece pieces_[most_pieces + 1];
 };
 
-// A path while it is joined: one separator longer than a path may be, since the last is trimmed.
-using JoinedPath = TextBuffer<ZV_PATH_MAX + 1>;
+// A path while it is joined, with room for the separators that are trimmed from its end: the one
+// behind the last component, and that of a root in its place.
+using JoinedPath = TextBuffer<ZV_PATH_MAX + 2>;
 
 // Appends a component and the separator behind it. False when they do not fit.
 [[nodiscard]] bool join(JoinedPath& path, std::string_view component);
