@@ -110,8 +110,8 @@ class Tool(unittest.TestCase):
         self.assertIn("current  " + seen_by_tool(work).replace("\\", "/") + "\n", output)
         self.assertEqual(self.zv("--version"), (0, "zv 1.0.0b\n", ""))
         self.assertIn("copy", self.zv("--help")[1])
-        for words in ([], ["no-such"], ["copy", "one"], ["copy", "a", "b", "c"],
-                      ["copy", "a", "b", "--retries", "-1"], ["path"], ["plugins", "a", "--min", "x"]):
+        for words in ([], ["no-such"], ["copy", "one"], ["copy", "a", "b", "c"], ["match", "a"],
+                      ["copy", "a", "b", "--retries", "-1"]):
             with self.subTest(words):
                 code, output, message = self.zv(*words)
                 self.assertEqual((code, output), (2, ""))

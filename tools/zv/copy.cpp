@@ -1,23 +1,15 @@
 // zv copy: one file from a location to another.
 #include <cstdio>
-#include <memory>
 #include <optional>
 #include <string_view>
 
-#include "command.h"
+#include "commands.h"
 #include "progress.h"
 #include "terminal.h"
 #include "zarvo.h"
 
 namespace tool {
 namespace {
-
-struct Options {
-  std::string from;
-  std::string to;
-  int retries = 2;
-  bool quiet = false;
-};
 
 bool begins_with(const std::string& location, std::string_view scheme) {
   return zv_strnicmp(location.c_str(), scheme.data(), scheme.size()) == 0;
@@ -40,14 +32,16 @@ int64_t size_of(const std::string& path) {
 
 // A failure of a source on the network may be one of the moment, and nothing has been sent on yet:
 // the same again does no harm. A destination may have taken what it was given, a mail for one.
-int copy_with_retries(const Options& options) {
+int copy_with_retries(const CopyOptions& options) {
   int result = zv_copy(options.from.c_str(), options.to.c_str());
   for (int i = 0; i < options.retries && result == -3 && is_network(options.from); ++i)
     result = zv_copy(options.from.c_str(), options.to.c_str());
   return result;
 }
 
-int copy(const Options& options) {
+}  // namespace
+
+int copy(const CopyOptions& options) {
   std::optional<Progress> progress;
   if (!options.quiet && is_terminal(stderr))
     progress.emplace(local_path(options.to), size_of(local_path(options.from)));
@@ -60,26 +54,6 @@ int copy(const Options& options) {
   }
   complain("cannot put " + options.to);
   return destination_failed;
-}
-
-}  // namespace
-
-void add_copy(CLI::App& app, int& exit_code) {
-  const auto options = std::make_shared<Options>();
-  CLI::App* const command = app.add_subcommand("copy", "Copy one file between two locations");
-  command->footer(
-      "A location is a path, file://, ftp://, http:// or, as a destination, smtp://:\n"
-      "  ftp://[user[:password]@]host[:port]/path\n"
-      "  smtp://[sender[:password]@]host[:port]/recipient  mails the file\n"
-      "The exit code is 3 when the source failed and 4 when the destination did.");
-  command->add_option("FROM", options->from, "a location")->required()->type_name("");
-  command->add_option("TO", options->to, "another")->required()->type_name("");
-  command->add_option("--retries", options->retries, "how often a failed download is tried again")
-      ->check(CLI::Range(0, 100))
-      ->capture_default_str()
-      ->type_name("N");
-  command->add_flag("--quiet", options->quiet, "show no progress");
-  command->callback([options, &exit_code] { exit_code = copy(*options); });
 }
 
 }  // namespace tool

@@ -1,7 +1,7 @@
 // See path_text.h.
 #include "path_text.h"
 
-#include "command.h"
+#include "commands.h"
 
 bool tool::PathText::assign(const std::string& path) {
   if (path.size() >= ZV_PATH_MAX) {

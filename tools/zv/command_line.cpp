@@ -1,0 +1,112 @@
+// What can stand on the command line: the commands, their options, and the help for both.
+#include "command_line.h"
+
+#include <CLI/CLI.hpp>
+#include <memory>
+
+#include "commands.h"
+#include "zarvo.h"
+
+namespace tool {
+namespace {
+
+// The commands, with the place where the one that ran leaves its exit code.
+struct Program {
+  CLI::App app{"Files, paths and plugins, the same on every platform.", "zv"};
+  int exit_code = done;
+};
+
+// One command whose options land in an Options, of which `run` then makes an exit code.
+template <class Options>
+class Command {
+ public:
+  Command(Program& program, CLI::App& parent, const char* name, const char* purpose,
+          int (*run)(const Options&))
+      : app_(parent.add_subcommand(name, purpose)) {
+    app_->callback([&program, run, options = options_] { program.exit_code = run(*options); });
+  }
+
+  // What must be given, in this order.
+  Command& needs(const char* name, std::string Options::*value, const char* help) {
+    app_->add_option(name, (*options_).*value, help)->required()->type_name("");
+    return *this;
+  }
+
+  template <class Value>
+  Command& takes(const char* name, Value Options::*value, const char* type, const char* help) {
+    app_->add_option(name, (*options_).*value, help)->type_name(type);
+    return *this;
+  }
+
+  // A number from 0 to `most`.
+  Command& takes_number(const char* name, int Options::*value, int most, const char* help) {
+    app_->add_option(name, (*options_).*value, help)
+        ->check(CLI::Range(0, most).description(""))
+        ->type_name("N");
+    return *this;
+  }
+
+  Command& flag(const char* name, bool Options::*value, const char* help) {
+    app_->add_flag(name, (*options_).*value, help);
+    return *this;
+  }
+
+  void note(const char* text) { app_->footer(text); }
+
+ private:
+  const std::shared_ptr<Options> options_ = std::make_shared<Options>();
+  CLI::App* const app_;
+};
+
+template <class Options>
+Command<Options> add(Program& program, const char* name, const char* purpose,
+                     int (*run)(const Options&)) {
+  return Command<Options>(program, program.app, name, purpose, run);
+}
+
+void add_copy(Program& program) {
+  add(program, "copy", "Copy one file between two locations", copy)
+      .needs("FROM", &CopyOptions::from, "a location")
+      .needs("TO", &CopyOptions::to, "another")
+      .takes_number("--retries", &CopyOptions::retries, 100,
+                    "how often a failed download is tried again; without it 2")
+      .flag("--quiet", &CopyOptions::quiet, "show no progress")
+      .note(
+          "A location is a path, file://, ftp://, http:// or, as a destination, smtp://:\n"
+          "  ftp://[user[:password]@]host[:port]/path\n"
+          "  smtp://[sender[:password]@]host[:port]/recipient  mails the file\n"
+          "The exit code is 3 when the source failed and 4 when the destination did.");
+}
+
+void add_match(Program& program) {
+  add(program, "match", "Tell whether a text matches a wildcard pattern", match)
+      .needs("TEXT", &MatchOptions::text, "the whole of it must match")
+      .needs("PATTERN", &MatchOptions::pattern, "* ? [a-z] [^a-z], and \\ before a plain sign")
+      .note("Prints nothing; the exit code is 0 for a match and 1 for none.");
+}
+
+void add_info(Program& program) {
+  add(program, "info", "Print the version, user, host and folders", info);
+}
+
+}  // namespace
+
+int run_command_line(int argc, char** argv) {
+  Program program;
+  program.app.allow_windows_style_options(false);  // "/x" is a path here on every platform
+  program.app.set_version_flag("--version", std::string("zv ") + zarvo_version(),
+                               "Print the version and exit");
+  program.app.require_subcommand(1);
+  for (const auto add_command : {add_copy, add_match, add_info}) add_command(program);
+  try {
+    program.app.parse(argc, argv);
+  } catch (const CLI::Success& wanted) {  // help, or the version
+    return program.app.exit(wanted);
+  } catch (const CLI::ParseError& error) {
+    complain(std::string(error.what()) + "\nRun zv --help, or zv COMMAND --help, for more.");
+    return wrong_usage;
+  }
+  return program.exit_code;
+}
+
+}  // namespace tool

@@ -1,0 +1,36 @@
+// The tool's commands: what each is told on the command line, and the function that does it and
+// gives the exit code. command_line.cpp fills the options in.
+#ifndef ZV_TOOL_COMMANDS_H
+#define ZV_TOOL_COMMANDS_H
+
+#include <climits>
+#include <string>
+
+namespace tool {
+
+// As a shell user expects them; a copy tells which side failed.
+enum ExitCode { done = 0, no = 1, wrong_usage = 2, source_failed = 3, destination_failed = 4 };
+
+struct CopyOptions {
+  std::string from;
+  std::string to;
+  int retries = 2;
+  bool quiet = false;
+};
+int copy(const CopyOptions& options);
+
+struct MatchOptions {
+  std::string text;
+  std::string pattern;
+};
+int match(const MatchOptions& options);
+
+struct InfoOptions {};
+int info(const InfoOptions& options);
+
+// A message for a person, on standard error.
+void complain(const std::string& message);
+
+}  // namespace tool
+
+#endif
