@@ -1,5 +1,6 @@
 # The names that the library exports are those that the public header declares with ZV_API:
-# writes them as a version script for ELF and as a module definition for Windows.
+# writes them as a version script for ELF and as a module definition for Windows, and lists them in
+# zarvo_exports.
 function(zarvo_write_exports header version_script definition)
   set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${header})
   file(READ ${header} text)
@@ -14,6 +15,7 @@ function(zarvo_write_exports header version_script definition)
   if(count EQUAL 0)
     message(FATAL_ERROR "${header} declares nothing with ZV_API")
   endif()
+  set(zarvo_exports ${names} PARENT_SCOPE)
   list(JOIN names ";\n    " elf_names)
   list(JOIN names "\n  " windows_names)
   file(CONFIGURE OUTPUT ${version_script} CONTENT

@@ -5,29 +5,14 @@ build against it and run, does it need what it may need, does it export what its
     package_test.py SOURCE BUILD CC CXX OBJDUMP [--toolchain FILE --emulator WINE]
 """
 import argparse
-import os
 import re
 import shutil
-import subprocess
-import tempfile
 import unittest
 from pathlib import Path
 
-WARNINGS = ["-Wall", "-Wextra", "-Wpedantic", "-Wconversion", "-Wshadow", "-Werror"]
+from installed import CONSUMER, WARNINGS, Installed, run
+
 WINDOWS_OWN = {"kernel32.dll", "msvcrt.dll", "advapi32.dll", "ws2_32.dll"}
-
-
-def run(*command, **more):
-    """The output of a command, which must succeed. It goes to a file: a pipe would stay open as
-    long as the emulator's own processes, which outlive the program."""
-    with tempfile.TemporaryFile("w+") as output:
-        done = subprocess.run([str(word) for word in command], stdout=output,
-                              stderr=subprocess.STDOUT, timeout=120, check=False, **more)
-        output.seek(0)
-        text = output.read()
-    if done.returncode != 0:
-        raise AssertionError(f"{' '.join(map(str, command))}: {done.returncode}\n{text}")
-    return text
 
 
 class Package(unittest.TestCase):
@@ -37,25 +22,10 @@ class Package(unittest.TestCase):
         cls.prefix = cls.root / "prefix"
         shutil.rmtree(cls.root, ignore_errors=True)
         run("cmake", "--install", args.build, "--prefix", cls.prefix)
+        cls.installed = Installed(cls.root, cls.prefix, args.cc, args.toolchain, args.emulator)
         cls.library = cls.prefix / ("bin/zarvo.dll" if args.windows else "lib/libzarvo.so")
         cls.declared = re.findall(r"^ZV_API [^;(]*?(\w+)\(", (args.source / "include/zarvo.h")
                                   .read_text(), flags=re.M)
-
-    def run_program(self, program):
-        env = dict(os.environ, LD_LIBRARY_PATH=str(self.prefix / "lib"),
-                   WINEPATH="Z:" + str(self.prefix / "bin").replace("/", "\\"))
-        emulator = [args.emulator] if args.windows else []
-        return run(*emulator, program, env=env, cwd=self.root)
-
-    def pkg_config(self, *words):
-        env = dict(os.environ, PKG_CONFIG_LIBDIR=str(self.prefix / "lib/pkgconfig"))
-        return run("pkg-config", *words, "zarvo", env=env).split()
-
-    def build_with_pkg_config(self, source):
-        program = self.root / (source.stem + ".exe")
-        run(args.cc, "-std=c99", *WARNINGS, source, "-o", program,
-            *self.pkg_config("--cflags", "--libs"))
-        return self.run_program(program)
 
     def test_files(self):
         expected = ["include/zarvo.h", "lib/pkgconfig/zarvo.pc", "lib/libzarvo.a",
@@ -64,23 +34,17 @@ class Package(unittest.TestCase):
             ["lib/libzarvo.so", "lib/libzarvo.so.1"]
         missing = [name for name in expected if not (self.prefix / name).exists()]
         self.assertEqual(missing, [])
-        self.assertEqual(self.pkg_config("--modversion"), ["1.0.0"])
+        self.assertEqual(self.installed.pkg_config("--modversion"), ["1.0.0"])
 
     def test_application_through_pkg_config(self):
-        output = self.build_with_pkg_config(args.source / "tests/package/consumer/consumer.c")
+        output = self.installed.with_pkg_config(CONSUMER / "consumer.c")
         self.assertEqual(output.strip(), "consumer: ok")
 
+    def test_static_application_through_pkg_config(self):
+        self.assertEqual(self.installed.static_with_pkg_config().strip(), "consumer: ok")
+
     def test_application_through_find_package(self):
-        build = self.root / "consumer"
-        toolchain = ["--toolchain", args.toolchain] if args.windows else \
-            [f"-DCMAKE_C_COMPILER={args.cc}"]
-        run("cmake", "-S", args.source / "tests/package/consumer", "-B", build, "-G", "Ninja",
-            f"-DCMAKE_PREFIX_PATH={self.prefix}", f"-DCMAKE_FIND_ROOT_PATH={self.prefix}",
-            *toolchain)
-        run("cmake", "--build", build)
-        for name in ("consumer", "consumer_static"):
-            program = build / "bin" / (name + (".exe" if args.windows else ""))
-            self.assertEqual(self.run_program(program).strip(), "consumer: ok")
+        self.assertEqual(self.installed.with_cmake(), ["consumer: ok"] * 2)
 
     def test_first_program_of_the_readme(self):
         blocks = re.findall(r"```c\n(.*?)```", (args.source / "README.md").read_text(), flags=re.S)
@@ -88,7 +52,7 @@ class Package(unittest.TestCase):
         for number, block in enumerate(blocks):
             source = self.root / f"readme{number}.c"
             source.write_text(block)
-            self.build_with_pkg_config(source)
+            self.installed.with_pkg_config(source)
 
     def test_header_compiles_alone(self):
         for name, compiler, standard in (("a.c", args.cc, "c99"), ("a.cpp", args.cxx, "c++11")):

@@ -1,0 +1,33 @@
+# The shared library: what it exports and how it is hardened.
+include(${PROJECT_SOURCE_DIR}/cmake/exports.cmake)
+zarvo_write_exports(${PROJECT_SOURCE_DIR}/include/zarvo.h
+                    ${CMAKE_CURRENT_BINARY_DIR}/zarvo.map ${CMAKE_CURRENT_BINARY_DIR}/zarvo.def)
+
+add_library(zarvo SHARED $<TARGET_OBJECTS:zarvo_objects>)
+set_target_properties(zarvo PROPERTIES
+  VERSION ${PROJECT_VERSION}
+  SOVERSION ${PROJECT_VERSION_MAJOR}
+  LINKER_LANGUAGE C)
+
+if(WIN32)
+  set_target_properties(zarvo PROPERTIES PREFIX "" IMPORT_PREFIX "lib" DLL_NAME_WITH_SOVERSION OFF)
+  target_sources(zarvo PRIVATE ${CMAKE_CURRENT_BINARY_DIR}/zarvo.def)
+  target_link_libraries(zarvo PRIVATE ws2_32 advapi32 pthread ssp)
+  target_link_options(zarvo PRIVATE -Wl,--high-entropy-va,--dynamicbase,--nxcompat)
+  # libzarvo.dll.a comes from the linker; other compilers' import library, zarvo.lib, from LLVM.
+  find_program(ZARVO_DLLTOOL NAMES llvm-dlltool llvm-dlltool-14 NO_CMAKE_FIND_ROOT_PATH)
+  if(ZARVO_DLLTOOL)
+    set(zarvo_import_library ${PROJECT_BINARY_DIR}/src/zarvo.lib)
+    add_custom_command(TARGET zarvo POST_BUILD BYPRODUCTS ${zarvo_import_library}
+      COMMAND ${ZARVO_DLLTOOL} -m i386:x86-64 -d zarvo.def -l ${zarvo_import_library})
+    install(FILES ${zarvo_import_library} DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT development)
+  endif()
+else()
+  target_link_libraries(zarvo PRIVATE ${CMAKE_DL_LIBS})
+  target_link_options(zarvo PRIVATE
+    -Wl,--version-script,${CMAKE_CURRENT_BINARY_DIR}/zarvo.map
+    -Wl,-z,relro,-z,now,-z,noexecstack)
+  if(NOT ZARVO_SANITIZE)
+    target_link_options(zarvo PRIVATE -Wl,-z,defs)
+  endif()
+endif()

@@ -1,0 +1,79 @@
+"""An installed library, as its users meet it: where pkg-config and CMake find it, and applications
+built against it and run."""
+import os
+import re
+import subprocess
+import tempfile
+from pathlib import Path
+
+SOURCE = Path(__file__).resolve().parents[2]
+CONSUMER = SOURCE / "tests/package/consumer"
+WARNINGS = ["-Wall", "-Wextra", "-Wpedantic", "-Wconversion", "-Wshadow", "-Werror"]
+
+
+def run(*command, **more):
+    """The output of a command, which must succeed. It goes to a file: a pipe would stay open as
+    long as the emulator's own processes, which outlive the program."""
+    with tempfile.TemporaryFile("w+") as output:
+        done = subprocess.run([str(word) for word in command], stdout=output,
+                              stderr=subprocess.STDOUT, timeout=120, check=False, **more)
+        output.seek(0)
+        text = output.read()
+    if done.returncode != 0:
+        raise AssertionError(f"{' '.join(map(str, command))}: {done.returncode}\n{text}")
+    return text
+
+
+class Installed:
+    """The library below `prefix`, or where the system has it when that is None. `root` is a folder
+    for what is built; `emulator` runs a Windows program."""
+
+    def __init__(self, root, prefix=None, cc="cc", toolchain=None, emulator=None):
+        self.root, self.prefix, self.cc = root, prefix, cc
+        self.toolchain, self.emulator = toolchain, emulator
+        root.mkdir(parents=True, exist_ok=True)
+
+    def run_program(self, program, *words, **more):
+        env = dict(os.environ)
+        if self.prefix:
+            env.update(LD_LIBRARY_PATH=str(self.prefix / "lib"),
+                       WINEPATH="Z:" + str(self.prefix / "bin").replace("/", "\\"))
+        emulator = [self.emulator] if self.emulator else []
+        return run(*emulator, program, *words, env=env, **{"cwd": self.root, **more})
+
+    def pkg_config(self, *words):
+        env = dict(os.environ)
+        if self.prefix:
+            env.update(PKG_CONFIG_LIBDIR=str(self.prefix / "lib/pkgconfig"))
+        return run("pkg-config", *words, "zarvo", env=env).split()
+
+    def compile(self, source, *words):
+        """The program that a C99 source becomes with these words at the end of the command."""
+        program = self.root / (source.stem + ".exe")
+        run(self.cc, "-std=c99", *WARNINGS, source, "-o", program, *words)
+        return program
+
+    def with_pkg_config(self, source):
+        return self.run_program(self.compile(source, *self.pkg_config("--cflags", "--libs")))
+
+    def static_with_pkg_config(self):
+        """What the sample application prints when it has the library inside."""
+        program = self.compile(CONSUMER / "consumer.c", "-static",
+                               *self.pkg_config("--static", "--cflags", "--libs"))
+        needed = re.search(rb"libzarvo\.so|zarvo\.dll", program.read_bytes())
+        if needed:
+            raise AssertionError(f"{program} needs {needed[0]}")
+        return self.run_program(program)
+
+    def with_cmake(self, *definitions):
+        """What each program of the sample application prints."""
+        build = self.root / "consumer"
+        toolchain = ["--toolchain", self.toolchain] if self.toolchain else \
+            [f"-DCMAKE_C_COMPILER={self.cc}"]
+        place = [f"-DCMAKE_PREFIX_PATH={self.prefix}", f"-DCMAKE_FIND_ROOT_PATH={self.prefix}"] \
+            if self.prefix else []
+        run("cmake", "--fresh", "-S", CONSUMER, "-B", build, "-G", "Ninja", *place, *toolchain,
+            *definitions)
+        run("cmake", "--build", build)
+        return [self.run_program(program).strip() for program in sorted((build / "bin").iterdir())
+                if program.suffix in ("", ".exe")]
