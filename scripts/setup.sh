@@ -5,8 +5,10 @@
 build_packages=(cmake ninja-build g++ binutils pkgconf python3 googletest libcli11-dev libstb-dev)
 server_packages=(nginx-light vsftpd python3-aiosmtpd)
 test_packages=("${build_packages[@]}" "${server_packages[@]}" attr valgrind)
-windows_packages=(g++-mingw-w64-x86-64-posix wine64)
+windows_packages=(g++-mingw-w64-x86-64-posix wine64 llvm)
 lint_packages=(clang clang-format clang-tidy libclang-rt-14-dev cppcheck shellcheck)
+docs_packages=(doxygen)
+package_packages=(dpkg-dev file gzip man-db util-linux)
 
 fail() {
     printf '%s: %s\n' "${0##*/}" "$*" >&2

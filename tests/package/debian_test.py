@@ -1,0 +1,82 @@
+#!/usr/bin/env python3
+"""Installs the Debian packages on this machine, uses them as a developer and as a shell user would,
+and removes them: nothing of them may stay. `scripts/test_packages` gives it a private view of the
+machine's files where it can.
+
+    debian_test.py PACKAGE...
+"""
+import gzip
+import os
+import subprocess
+import sys
+import tempfile
+import unittest
+from pathlib import Path
+
+from installed import CONSUMER, Installed, run
+
+NAMES = ["libzarvo1", "libzarvo-dev", "zv"]
+
+
+def installed_names():
+    found = subprocess.run(["dpkg-query", "-W", "-f", "${db:Status-Status} ${Package}\n", *NAMES],
+                           stdout=subprocess.PIPE, stderr=subprocess.DEVNULL, text=True, check=False)
+    return [line.split()[1] for line in found.stdout.splitlines() if line.startswith("installed ")]
+
+
+class Debian(unittest.TestCase):
+    @classmethod
+    def setUpClass(cls):
+        if installed_names():
+            raise AssertionError(f"remove your own first: {' '.join(installed_names())}")
+        run("dpkg", "--install", *packages)
+        cls.scratch = tempfile.TemporaryDirectory()
+        cls.installed = Installed(Path(cls.scratch.name))
+
+    @classmethod
+    def tearDownClass(cls):
+        cls.scratch.cleanup()
+        if installed_names():
+            run("dpkg", "--purge", *NAMES)
+
+    def test_1_applications(self):
+        for words in (["--cflags"], ["--libs"]):  # the system's own folders need no mention
+            self.assertNotIn("/usr", " ".join(self.installed.pkg_config(*words)))
+        self.assertEqual(self.installed.with_pkg_config(CONSUMER / "consumer.c"), "consumer: ok\n")
+        self.assertEqual(self.installed.static_with_pkg_config(), "consumer: ok\n")
+        self.assertEqual(self.installed.with_cmake(), ["consumer: ok"] * 2)
+
+    def test_1_dependencies(self):
+        """An application's package finds out by itself what it depends on."""
+        program = self.installed.compile(CONSUMER / "consumer.c", "-lzarvo")
+        (self.installed.root / "debian").mkdir()
+        (self.installed.root / "debian/control").write_text("Source: x\n\nPackage: x\nArchitecture: any\n")
+        found = run("dpkg-shlibdeps", "-O", program, cwd=self.installed.root)
+        self.assertIn("libzarvo1 (>= 1.0.0~beta)", found)
+
+    def test_1_tool(self):
+        self.assertTrue(run("zv", "--version").startswith("zv 1.0.0b"))
+        self.assertIn("1.0.0b", run("zv", "info"))
+
+    def test_1_documents(self):
+        for name, title in (("zarvo", "same application code"), ("zv_copy", "Copying between"),
+                            ("zarvo_strlist", "String lists")):
+            page = run("man", "--warnings", "-P", "cat", "3", name)
+            self.assertIn(title, page)
+            self.assertNotIn("warning", page)
+        for name in NAMES:
+            folder = Path("/usr/share/doc", name)
+            self.assertIn("MIT License", (folder / "copyright").read_text())
+            self.assertIn("[1.0.0b]", gzip.open(folder / "changelog.gz", "rt").read())
+
+    def test_2_nothing_stays(self):
+        listed = {path for name in NAMES for path in run("dpkg", "-L", name).split()
+                  if not os.path.isdir(path) or "zarvo" in path or path.endswith("/zv")}
+        self.assertGreater(len(listed), 100)
+        run("dpkg", "--purge", *NAMES)
+        self.assertEqual([path for path in listed if os.path.lexists(path)], [])
+        self.assertNotIn("libzarvo", run("ldconfig", "-p"))
+
+
+packages = sys.argv[1:]
+unittest.main(argv=["debian_test.py", "-v"])

@@ -1,0 +1,51 @@
+#!/usr/bin/env python3
+"""Unpacks the Windows zip and uses it as a developer on Windows would, with either import library.
+
+    windows_zip_test.py ZIP FOLDER TOOLCHAIN_FILE EMULATOR
+"""
+import shutil
+import sys
+import unittest
+import zipfile
+from pathlib import Path
+
+from installed import CONSUMER, Installed
+
+CC = "x86_64-w64-mingw32-gcc-posix"
+
+
+class WindowsZip(unittest.TestCase):
+    @classmethod
+    def setUpClass(cls):
+        shutil.rmtree(folder, ignore_errors=True)
+        with zipfile.ZipFile(package) as file:
+            file.extractall(folder)
+        cls.prefix, = folder.iterdir()
+        cls.installed = Installed(folder / "applications", cls.prefix, CC, toolchain, emulator)
+
+    def test_each_import_library(self):
+        for library in ("libzarvo.dll.a", "zarvo.lib"):
+            program = self.installed.compile(CONSUMER / "consumer.c", "-I", self.prefix / "include",
+                                             self.prefix / "lib" / library)
+            self.assertIn(b"zarvo.dll", program.read_bytes())
+            self.assertEqual(self.installed.run_program(program).strip(), "consumer: ok")
+
+    def test_pkg_config(self):
+        output = self.installed.with_pkg_config(CONSUMER / "consumer.c")
+        self.assertEqual(output.strip(), "consumer: ok")
+        self.assertEqual(self.installed.static_with_pkg_config().strip(), "consumer: ok")
+
+    def test_cmake(self):
+        """With either import library: zarvo.lib is for compilers that CMake calls MSVC."""
+        for words in ([], ["-DMSVC=1"]):
+            self.assertEqual(self.installed.with_cmake(*words), ["consumer: ok"] * 2)
+            commands = (folder / "applications/consumer/build.ninja").read_text()
+            self.assertEqual("lib/zarvo.lib" in commands, bool(words))
+
+    def test_tool(self):
+        output = self.installed.run_program(self.prefix / "bin/zv.exe", "--version")
+        self.assertTrue(output.startswith("zv 1.0.0b"))
+
+
+package, folder, toolchain, emulator = (Path(word).absolute() for word in sys.argv[1:])
+unittest.main(argv=["windows_zip_test.py", "-v"])
