@@ -31,13 +31,49 @@ static void strings(void) {
   EXPECT(zv_strncpy(text, "  Width x Height ", sizeof text) == 17);
   EXPECT(zv_strtrim(text) == 14);
   EXPECT(zv_strlwr(text) == 14 && strcmp(text, "width x height") == 0);
-  EXPECT(zv_stricmp(text, "WIDTH X height") == 0);
-  EXPECT(zv_stristr(text, "HEIGHT") == text + 8);
+  EXPECT(zv_strireplstr(text, " X ", "*") == 1 && zv_stricmp(text, "WIDTH*height") == 0);
+  EXPECT(zv_stristr(text, "HEIGHT") == text + 6);
+  EXPECT(zv_strpat("picture.png", "*.[pj][np]g") == 1);
+}
+
+static void lists(void) {
+  char** list = NULL;
+  EXPECT(zv_strlist(&list, "one,three,", ',') == 2);
+  EXPECT(zv_strlist_insert(&list, 2, 1, "two") == 1);
+  EXPECT(zv_strlist_len(list) == 3 && zv_strlist_iidx(list, -1, "THREE") == 2);
+  EXPECT(zv_strlist_free(list, 3) == 0);
+}
+
+static void paths_and_host(void) {
+  char path[ZV_PATH_MAX] = "a\\.\\b/../c.txt";
+  char folder[ZV_PATH_MAX], out[ZV_PATH_MAX];
+  EXPECT(zv_normalize_path(path) == 1 && strcmp(path, "a/c.txt") == 0);
+  EXPECT(zv_getcwd(folder, sizeof folder) == 1);
+  EXPECT(zv_absolute(path, NULL, out, sizeof out) == 1);
+  EXPECT(zv_relative(out, folder, out, sizeof out) == 1 && strcmp(out, path) == 0);
+  EXPECT(zv_extract_extension(path, out, sizeof out) == 1 && strcmp(out, ".txt") == 0);
+  EXPECT(zv_username(out, sizeof out) > 0);
+}
+
+static void environment_and_files(void) {
+  struct _stat64 status;
+  char* value;
+  FILE* file = fopen("consumer.txt", "wb");
+  EXPECT(file != NULL && fputs("text", file) >= 0 && fclose(file) == 0);
+  EXPECT(zv_copy("consumer.txt", "consumer.copy") == 0);
+  EXPECT(zv_stat("consumer.copy", &status) == 0 && status.st_size == 4);
+  EXPECT(zv_putenv_private("LIB", "plugins", 0) == 1);
+  value = zv_getenv_private("LIB");
+  EXPECT(value != NULL && strcmp(value, "plugins") == 0);
+  zv_free(value);
 }
 
 int main(void) {
   memory_and_version();
   strings();
+  lists();
+  paths_and_host();
+  environment_and_files();
   if (failures == 0) puts("consumer: ok");
   return failures != 0;
 }
