@@ -1186,53 +1186,410 @@ ZV_API char* zv_getenv_private(const char* name);
  * Byte order
  */
 
-int16_t zv_swap_int16(int16_t value);
-uint16_t zv_swap_uint16(uint16_t value);
-int32_t zv_swap_int32(int32_t value);
-uint32_t zv_swap_uint32(uint32_t value);
-int64_t zv_swap_int64(int64_t value);
-uint64_t zv_swap_uint64(uint64_t value);
-float zv_swap_float(float value);
-double zv_swap_double(double value);
-void zv_swapv_16(uint16_t* data, int count);
-void zv_swapv_32(uint32_t* data, int count);
-void zv_swapv_64(uint64_t* data, int count);
-void zv_swapv(void* data, int count, size_t size);
+/**
+ * @defgroup byteorder Byte order
+ * Values and arrays with their bytes in the opposite order.
+ *
+ * Bytes are reversed unconditionally: whether a file's order differs from the machine's is the
+ * caller's to know. Twice is the value again, bit for bit.
+ *
+ * @code
+ * uint32_t magic = zv_swap_uint32(0x7F454C46);  // 0x464C457F
+ * zv_swapv_16(samples, sample_count);           // in place
+ * @endcode
+ * @{
+ */
+
+/**
+ * Exchange the two bytes of a value.
+ *
+ * @param value the value.
+ * @return its bytes in the opposite order.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int16_t zv_swap_int16(int16_t value);
+
+/**
+ * Exchange the two bytes of a value.
+ *
+ * @param value the value.
+ * @return its bytes in the opposite order.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API uint16_t zv_swap_uint16(uint16_t value);
+
+/**
+ * Reverse the four bytes of a value.
+ *
+ * @param value the value.
+ * @return its bytes in the opposite order.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int32_t zv_swap_int32(int32_t value);
+
+/**
+ * Reverse the four bytes of a value.
+ *
+ * @param value the value.
+ * @return its bytes in the opposite order.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API uint32_t zv_swap_uint32(uint32_t value);
+
+/**
+ * Reverse the eight bytes of a value.
+ *
+ * @param value the value.
+ * @return its bytes in the opposite order.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int64_t zv_swap_int64(int64_t value);
+
+/**
+ * Reverse the eight bytes of a value.
+ *
+ * @param value the value.
+ * @return its bytes in the opposite order.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API uint64_t zv_swap_uint64(uint64_t value);
+
+/**
+ * Reverse the four bytes of a `float`.
+ *
+ * Nothing is converted: the result may be any bit pattern, a NaN too. A signalling NaN is safe only
+ * where the machine passes a `float` unchanged; to swap file contents, swap the bytes in place.
+ *
+ * @param value the value.
+ * @return the `float` whose bytes are those of the value in the opposite order.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API float zv_swap_float(float value);
+
+/**
+ * Reverse the eight bytes of a `double`.
+ *
+ * Nothing is converted: the result may be any bit pattern, a NaN too. A signalling NaN is safe only
+ * where the machine passes a `double` unchanged; to swap file contents, swap the bytes in place.
+ *
+ * @param value the value.
+ * @return the `double` whose bytes are those of the value in the opposite order.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API double zv_swap_double(double value);
+
+/**
+ * Reverse the bytes of each element of an array of 2-byte elements, in place.
+ *
+ * @param data  the array, at any address.
+ * @param count how many elements; 0 and less touch nothing.
+ * @par Thread safety
+ *   Safe from any thread, for distinct arrays.
+ */
+ZV_API void zv_swapv_16(uint16_t* data, int count);
+
+/**
+ * Reverse the bytes of each element of an array of 4-byte elements, in place.
+ *
+ * @param data  the array, at any address.
+ * @param count how many elements; 0 and less touch nothing.
+ * @par Thread safety
+ *   Safe from any thread, for distinct arrays.
+ */
+ZV_API void zv_swapv_32(uint32_t* data, int count);
+
+/**
+ * Reverse the bytes of each element of an array of 8-byte elements, in place.
+ *
+ * @param data  the array, at any address.
+ * @param count how many elements; 0 and less touch nothing.
+ * @par Thread safety
+ *   Safe from any thread, for distinct arrays.
+ */
+ZV_API void zv_swapv_64(uint64_t* data, int count);
+
+/**
+ * Reverse the bytes of each element of an array, in place.
+ *
+ * @param data  the array, at any address.
+ * @param count how many elements; 0 and less touch nothing.
+ * @param size  bytes in an element: 2, 4 or 8. Any other size touches nothing.
+ * @par Thread safety
+ *   Safe from any thread, for distinct arrays.
+ */
+ZV_API void zv_swapv(void* data, int count, size_t size);
+
+/** @} */
 
 /* ================================================================================================
  * File streams
  */
 
-FILE* zv_fopen(const char* path, const char* mode, int* flag);
-int zv_fclose(FILE* fp);
-size_t zv_fread(void* buf, size_t size, size_t count, FILE* fp, int swap);
-size_t zv_fwrite(void* buf, size_t size, size_t count, FILE* fp, int swap);
-int zv_fseek(FILE* fp, int64_t offset, int origin);
-int64_t zv_ftell(FILE* fp);
-int zv_fskip(FILE* fp);
-char* zv_fgets(char* buf, int size, FILE* fp, int strip_cr);
-int zv_fputs(const char* s, FILE* fp, int crlf);
+/**
+ * @defgroup stream File streams
+ * The C library's streams, always binary, with offsets of 64 bits, and with conversions on request:
+ * blocks with their bytes reversed, lines between CR LF and LF.
+ *
+ * A stream is the C library's own `FILE*`, so what is not here is done with the C library; on
+ * Windows only by a caller that shares the library's C runtime. No function sets an error of its
+ * own: `errno` is as the C library left it.
+ *
+ * @code
+ * char line[256];
+ * FILE* const in = zv_fopen("notes.txt", "r", NULL);
+ * if (in != NULL) {
+ *   while (zv_fgets(line, sizeof line, in, 1) != NULL) zv_fputs(line, stdout, 0);
+ *   zv_fclose(in);
+ * }
+ * @endcode
+ * @{
+ */
+
+/**
+ * Open a file as a binary stream.
+ *
+ * @param path the file.
+ * @param mode as for `fopen`; "r" reads like "rb".
+ * @param flag receives 0 when the file could be opened and is untouched when not; may be NULL.
+ * @return the stream, to be closed with zv_fclose(); NULL when the file cannot be opened.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API FILE* zv_fopen(const char* path, const char* mode, int* flag);
+
+/**
+ * Close a stream. Whether the last bytes could be written is not told: a caller that must know
+ * calls `fflush` first.
+ *
+ * @param fp the stream, or NULL, which does nothing.
+ * @return 0, always.
+ * @par Thread safety
+ *   Safe from any thread, for distinct streams.
+ */
+ZV_API int zv_fclose(FILE* fp);
+
+/**
+ * Read elements.
+ *
+ * @param buf   receives them; at least `size` * `count` bytes.
+ * @param size  bytes in an element.
+ * @param count how many elements.
+ * @param fp    the stream.
+ * @param swap  non-zero to reverse the bytes of each element that was read, as zv_swapv() does it.
+ * @return how many whole elements were read, fewer than `count` at the end of the file or on a
+ *         failure.
+ * @par Thread safety
+ *   As `fread`: the stream is locked during the reading.
+ */
+ZV_API size_t zv_fread(void* buf, size_t size, size_t count, FILE* fp, int swap);
+
+/**
+ * Write elements.
+ *
+ * With `swap` the elements are reversed in the caller's own buffer and back again afterwards, after
+ * a failure too: the buffer must be writable, and nobody may look at it meanwhile.
+ *
+ * @param buf   the elements.
+ * @param size  bytes in an element.
+ * @param count how many elements.
+ * @param fp    the stream.
+ * @param swap  non-zero to write each element with its bytes reversed, as zv_swapv() does it.
+ * @return how many whole elements were written, fewer than `count` on a failure.
+ * @par Thread safety
+ *   As `fwrite`: the stream is locked during the writing.
+ */
+ZV_API size_t zv_fwrite(void* buf, size_t size, size_t count, FILE* fp, int swap);
+
+/**
+ * Move the position in a stream.
+ *
+ * @param fp     the stream.
+ * @param offset bytes from the origin.
+ * @param origin SEEK_SET, SEEK_CUR or SEEK_END.
+ * @return 0, or non-zero on failure.
+ * @par Thread safety
+ *   As `fseek`.
+ */
+ZV_API int zv_fseek(FILE* fp, int64_t offset, int origin);
+
+/**
+ * Tell the position in a stream.
+ *
+ * @param fp the stream.
+ * @return bytes from the start of the file, or -1 on failure.
+ * @par Thread safety
+ *   As `ftell`.
+ */
+ZV_API int64_t zv_ftell(FILE* fp);
+
+/**
+ * Skip the rest of a line, its line feed included. An end of file or an error from before is
+ * forgotten first.
+ *
+ * @param fp the stream, or NULL.
+ * @return 0; -1 when the file ended in front of a line feed, on a read error and for NULL.
+ * @par Thread safety
+ *   As `getc`, character by character.
+ */
+ZV_API int zv_fskip(FILE* fp);
+
+/**
+ * Read a line, or as much of it as there is room for.
+ *
+ * Each piece of a longer line is looked at alone: where its CR and its LF fall into two pieces,
+ * both stay.
+ *
+ * @param buf      receives the text with its line feed; the rest of the buffer is zero.
+ * @param size     bytes in `buf`, at least 1.
+ * @param fp       the stream.
+ * @param strip_cr non-zero to turn a CR LF at the end of the text into LF.
+ * @return `buf`, or NULL at the end of the file and on failure.
+ * @par Thread safety
+ *   As `fgets`.
+ */
+ZV_API char* zv_fgets(char* buf, int size, FILE* fp, int strip_cr);
+
+/**
+ * Write a text.
+ *
+ * @param s    the text.
+ * @param fp   the stream.
+ * @param crlf non-zero to write CR LF for each LF, whether or not a CR stands in front of it.
+ * @return 0, or -1 when not all could be written: then a part of it may have been.
+ * @par Thread safety
+ *   As `fwrite`; with `crlf` other threads' output may come between.
+ */
+ZV_API int zv_fputs(const char* s, FILE* fp, int crlf);
+
+/** @} */
 
 /* ================================================================================================
  * Directories
  */
 
+/**
+ * @defgroup directory Directories
+ * What a folder holds: one name after another, or a list of all that a filter lets through, with or
+ * without the folders below it.
+ *
+ * Names come in the platform's order, which is no order. A path with its NUL takes at most
+ * #ZV_PATH_MAX bytes: nothing longer is ever handed out, and a scan that meets one fails.
+ *
+ * @code
+ * const dirsel_t images = {NULL, "*.png;*.jpg", ";", 0, 0};
+ * char** list;
+ * int n = zv_dir_scan("album", &list, (dir_filter_t)zv_dir_select, (void*)&images, 1, 1);
+ * if (n >= 0) {
+ *   for (int i = 0; i < n; ++i) puts(list[i]);
+ *   zv_strlist_free(list, n);
+ * }
+ * @endcode
+ * @{
+ */
+
+/**
+ * Decides whether an entry goes into the list of a scan.
+ *
+ * @param dir  the folder being scanned: the text that zv_dir_scan() was given or, below it, a
+ *             folder's full path without a separator at its end.
+ * @param name the entry's name in that folder.
+ * @param user what the caller of zv_dir_scan() passed along.
+ * @return non-zero for an entry that goes into the list. A folder is scanned either way.
+ */
 typedef int (*dir_filter_t)(const char* dir, const char* name, void* user);
 
+/** What zv_dir_select() selects. The texts belong to the caller and are only read. */
 typedef struct dirsel_t {
-  const char* dir_patterns;
-  const char* file_patterns;
-  const char* separators;
-  int show_hidden;
-  int match_case;
+  const char* dir_patterns;  /**< patterns for directories; NULL or empty selects none */
+  const char* file_patterns; /**< patterns for all other entries; NULL or empty selects none */
+  const char* separators;    /**< NULL: each text above is one pattern; empty: each is a sequence of
+                                  NUL-terminated patterns that an empty one ends; else the characters
+                                  that part the patterns, of which 319 characters take part */
+  int show_hidden;           /**< 0: an entry with the hidden attribute is never selected */
+  int match_case;            /**< 0: names and patterns are compared in lower case */
 } dirsel_t;
 
-intptr_t zv_dir_readfirst(const char* dir, char* name, size_t size);
-int zv_dir_readnext(intptr_t handle, char* name, size_t size);
-intptr_t zv_dir_close(intptr_t handle);
-int zv_dir_scan(const char* dir, char*** list, dir_filter_t filter, void* user, int full_path,
-                int recursive);
-int zv_dir_select(const char* dir, const char* name, const dirsel_t* sel);
+/**
+ * Start to read a folder.
+ *
+ * All entries are reported, `.` and `..` among them, unless the platform leaves some out.
+ *
+ * @param dir  the folder; empty means the current one.
+ * @param name receives the first name, cut to `size` bytes with its NUL; untouched on failure.
+ * @param size bytes in `name`.
+ * @return a handle that zv_dir_close() must get back; -1 when the folder cannot be read.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API intptr_t zv_dir_readfirst(const char* dir, char* name, size_t size);
+
+/**
+ * Read the next name of a folder.
+ *
+ * @param handle the handle that zv_dir_readfirst() gave, or -1.
+ * @param name   receives the name, cut to `size` bytes with its NUL; untouched when there is none.
+ * @param size   bytes in `name`.
+ * @return 1, or 0 at the end, on a failure and for the handle -1.
+ * @par Thread safety
+ *   Safe from any thread, for distinct handles.
+ */
+ZV_API int zv_dir_readnext(intptr_t handle, char* name, size_t size);
+
+/**
+ * End the reading of a folder, at its end or before.
+ *
+ * @param handle the handle, no longer valid afterwards; -1 does nothing.
+ * @return -1, always, to be stored as the handle.
+ * @par Thread safety
+ *   Safe from any thread, for distinct handles.
+ */
+ZV_API intptr_t zv_dir_close(intptr_t handle);
+
+/**
+ * List what a folder holds, without `.` and `..`, each folder in front of its own content.
+ *
+ * A folder that is missing or cannot be read holds nothing; that is no failure. A symbolic link is
+ * an entry and is never followed, except where `dir` itself is one.
+ *
+ * @param dir       the folder; empty means the current one.
+ * @param list      receives the list, to be given back with zv_strlist_free(); NULL on failure.
+ * @param filter    decides about each entry, or NULL to list all.
+ * @param user      passed on to `filter`.
+ * @param full_path 0 for bare names, else `dir`, a `/` and the name.
+ * @param recursive 0 for this folder alone, else with all folders below it, as full paths.
+ * @return how many names `list` has. -1 when memory ran out, a path was too long or an entry could
+ *         not be examined; before the first name was stored these give 0 and an empty list.
+ * @par Thread safety
+ *   Safe from any thread, as far as `filter` is.
+ */
+ZV_API int zv_dir_scan(const char* dir, char*** list, dir_filter_t filter, void* user,
+                       int full_path, int recursive);
+
+/**
+ * Tell whether an entry is one that a selection asks for. Cast to #dir_filter_t it is a filter for
+ * zv_dir_scan(), with the selection as `user`.
+ *
+ * Patterns are those of zv_strpat(). A symbolic link is what its target is.
+ *
+ * @param dir  the folder.
+ * @param name the entry's name in it.
+ * @param sel  the selection; NULL selects everything, even what does not exist.
+ * @return 1 when the entry is selected; 0 when not, when it does not exist, when its path is too
+ *         long and for a name that is NULL or empty.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_dir_select(const char* dir, const char* name, const dirsel_t* sel);
+
+/** @} */
 
 /* ================================================================================================
  * File status and trees
@@ -1314,9 +1671,68 @@ ZV_API int zv_get_hidden(const char* path);
  */
 ZV_API int zv_set_hidden(const char* path, int hidden);
 
-int zv_mkpath(const char* path);
-int zv_mkfile(const char* path);
-int zv_rmpath(const char* path);
+/** @} */
+
+/**
+ * @defgroup tree Trees
+ * Whole chains of directories made, whole trees removed.
+ *
+ * Paths are in either separator style and have at most 319 characters: a longer one is refused,
+ * since a cut one would name something else. What was done before a failure stays done.
+ *
+ * @code
+ * if (zv_mkfile("out/report/summary.txt")) puts("out/report is there, and an empty file in it");
+ * if (zv_rmpath("out")) puts("and all of it is gone");
+ * @endcode
+ * @{
+ */
+
+/**
+ * Create every directory of a path that does not exist yet.
+ *
+ * What exists already is passed over, whatever it is: a file as the last piece too, while a file in
+ * front of another piece makes the creation of that one fail. A doubled separator inside the path
+ * ends it, as for zv_split_path().
+ *
+ * @param path the path; the empty one asks for nothing.
+ * @return 1 when all of it exists afterwards, 0 otherwise and for a path of more than 319
+ *         characters.
+ * @par Thread safety
+ *   Safe from any thread, also for paths with common parts.
+ */
+ZV_API int zv_mkpath(const char* path);
+
+/**
+ * Create an empty file, and the directories that lead to it as zv_mkpath() does. A file that exists
+ * already is emptied.
+ *
+ * @param path the file.
+ * @return 1 when the file is there and empty, 0 otherwise and for a path of more than 319
+ *         characters.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_mkfile(const char* path);
+
+/**
+ * Remove a directory with everything below it.
+ *
+ * The tree is listed first, and nothing is removed when it cannot be listed, as when the path of an
+ * entry would have more than 319 characters; then entries are removed from the last to the first,
+ * and the first that cannot be removed ends it. Entries that vanished meanwhile are passed over.
+ * There is no roll-back. Hidden entries are removed like others; a read-only file stops it where
+ * the platform protects such files.
+ *
+ * Links are never followed: a link in the tree is removed itself, and a link in place of the
+ * directory, with or without a separator behind it, gives 0. On Linux a directory that is swapped
+ * for a link meanwhile does not lead the removal outside the tree either.
+ *
+ * @param path the directory.
+ * @return 1 when all of it was removed, 0 otherwise and for a path of more than 319 characters.
+ * @par Thread safety
+ *   Safe from any thread; what others create in the tree meanwhile makes it give 0.
+ */
+ZV_API int zv_rmpath(const char* path);
 
 /** @} */
 

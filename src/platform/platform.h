@@ -49,6 +49,10 @@ bool home_folder(PathBuffer& out);  // as the platform writes it
 // The time now on the local clock, and its offset from UTC at that moment.
 bool local_time(struct tm& out, int& offset_minutes);
 
+// ---- processor.cpp: what the machine can do -----------------------------------------------------
+
+bool has_wide_vectors();  // AVX2
+
 // ---- stream.cpp: what C streams leave out -------------------------------------------------------
 
 void set_binary(FILE* stream);
@@ -75,12 +79,38 @@ struct Entry {
   EntryKind kind;    // of the entry itself: a link is a link
 };
 
-// A search through one folder, in the platform's order, "." and ".." included. -1: no search.
+constexpr intptr_t no_search = -1;
+
+// A search through one folder, in the platform's order, "." and ".." included; "" is the current
+// one. The folder that is named may be reached through a link.
 intptr_t search_first(const char* directory, Entry& entry);
+
+// A search through the folder that another search has just found: `name` there, `path` from where
+// the process stands. Where the platform can, a link that took the folder's place is refused.
+intptr_t search_below(intptr_t search, const char* name, const char* path, Entry& entry);
+
 bool search_next(intptr_t search, Entry& entry);
 void search_close(intptr_t search);
 
+// What a path itself is, for an entry whose kind its search did not tell; unknown when it is gone.
+EntryKind entry_kind(const char* path);
+
 // ---- tree.cpp: removal that cannot be led outside its tree --------------------------------------
+
+constexpr intptr_t no_folder = -1;
+
+// A folder held open where the platform can, so that what is removed in it lies in it whatever
+// becomes of its path. Only a folder itself is opened, not a link to one.
+intptr_t folder_open(const char* path);
+intptr_t folder_open_below(intptr_t folder, const char* name, const char* path);
+void folder_close(intptr_t folder);
+
+enum class Removal { removed, gone, failed };
+
+// Removes an entry itself, a folder only when it is empty. `path` is its full path, for a platform
+// that has no calls relative to a folder.
+Removal remove_below(intptr_t folder, const char* name, const char* path);
+bool remove_folder(const char* path);
 
 // ---- library.cpp: dynamic libraries -------------------------------------------------------------
 

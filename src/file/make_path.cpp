@@ -1,0 +1,66 @@
+// Making what a path names: a chain of folders, an empty file in them.
+#include "frame/owner.h"
+#include "path/components.h"
+#include "platform/platform.h"
+#include "zarvo.h"
+
+namespace platform = zv::platform;
+
+namespace {
+
+// The caller's path with '/' alone. False for one that is too long: a cut path would name something
+// else to make.
+bool take_path(const char* path, zv::PathBuffer& out) {
+  if (!out.assign_cut(path)) return false;
+  out.replace('\\', '/');
+  return true;
+}
+
+bool exists(const char* path) {
+  struct _stat64 st;
+  return platform::status(path, &st) == 0;
+}
+
+// The path of the first `count` pieces, a root with its separator.
+bool join_first(const zv::Components& pieces, size_t count, zv::JoinedPath& out) {
+  out.clear();
+  for (size_t i = 0; i < count; ++i)
+    if (!zv::join(out, pieces[i])) return false;
+  return zv::finish(out);
+}
+
+// Where another process was quicker, its folder serves as well.
+bool make_folder(const char* path) {
+  return platform::make_directory(path) == 0 || exists(path);
+}
+
+bool make_folders(const zv::Components& pieces) {
+  zv::JoinedPath prefix;
+  // What exists tells that everything in front of it does, so the search for it starts at the end.
+  size_t made = pieces.size();
+  for (; made > 0; --made) {
+    if (!join_first(pieces, made, prefix)) return false;
+    if (exists(prefix.c_str())) break;
+  }
+  for (; made < pieces.size(); ++made)
+    if (!join_first(pieces, made + 1, prefix) || !make_folder(prefix.c_str())) return false;
+  return true;
+}
+
+}  // namespace
+
+int zv_mkpath(const char* path) {
+  zv::PathBuffer text;
+  return take_path(path, text) && make_folders(zv::Components(text.view()));
+}
+
+int zv_mkfile(const char* path) {
+  zv::PathBuffer file;
+  zv::PathBuffer folder;
+  if (!take_path(path, file)) return 0;
+  const bool has_folder = folder.fill([&file](char* room, size_t size) {
+    return zv_extract_directory(file.c_str(), room, size) != 0;
+  });
+  if (has_folder && zv_mkpath(folder.c_str()) == 0) return 0;
+  return zv::StreamPtr(std::fopen(file.c_str(), "wb")) != nullptr;
+}

@@ -1,0 +1,90 @@
+// The ready-made filter of directory scans: wildcard patterns, kinds, the hidden attribute.
+//
+// Everything that is asked here is only read, so the order is free: the patterns come first, and an
+// entry that matches none costs no call to the platform.
+#include <cstring>
+
+#include "platform/platform.h"
+#include "zarvo.h"
+
+namespace platform = zv::platform;
+
+namespace {
+
+constexpr unsigned kind_mask = 0xF000;
+constexpr unsigned directory_kind = 0x4000;
+
+// One name, compared with one pattern after another.
+class Matcher {
+ public:
+  Matcher(const char* name, bool match_case) : name_(name), match_case_(match_case) {
+    if (match_case) return;
+    lowered_.assign_cut(name);
+    lowered_.edit_shrinking(zv_strlwr);
+    name_ = lowered_.c_str();
+  }
+
+  bool matches(const char* pattern) const {
+    if (match_case_) return zv_strpat(name_, pattern) != 0;
+    zv::PathBuffer lowered;
+    lowered.assign_cut(pattern);
+    lowered.edit_shrinking(zv_strlwr);
+    return zv_strpat(name_, lowered.c_str()) != 0;
+  }
+
+  bool matches_one_of(const char* patterns, const char* separators) const {
+    if (patterns == nullptr || *patterns == '\0') return false;
+    if (separators == nullptr) return matches(patterns);
+    if (*separators == '\0') return matches_in_sequence(patterns);
+    zv::PathBuffer fields;
+    fields.assign_cut(patterns);
+    return matches_in_fields(fields.c_str(), separators);
+  }
+
+ private:
+  bool matches_in_sequence(const char* pattern) const {
+    for (; *pattern != '\0'; pattern += std::strlen(pattern) + 1)
+      if (matches(pattern)) return true;
+    return false;
+  }
+
+  // Fields as strtok() tells them: empty ones do not count.
+  bool matches_in_fields(const char* fields, const char* separators) const {
+    zv::PathBuffer field;
+    for (fields += std::strspn(fields, separators); *fields != '\0';
+         fields += std::strspn(fields, separators)) {
+      const size_t size = std::strcspn(fields, separators);
+      if (field.assign({fields, size}) && matches(field.c_str())) return true;
+      fields += size;
+    }
+    return false;
+  }
+
+  const char* name_;
+  bool match_case_;
+  zv::PathBuffer lowered_;
+};
+
+[[nodiscard]] bool join(zv::PathBuffer& path, const char* dir, const char* name) {
+  return path.append(dir) && (path.empty() || path.back() == '/' || path.append('/')) &&
+         path.append(name);
+}
+
+}  // namespace
+
+int zv_dir_select(const char* dir, const char* name, const dirsel_t* sel) {
+  if (name == nullptr || *name == '\0') return 0;
+  if (sel == nullptr) return 1;
+
+  const Matcher matcher(name, sel->match_case != 0);
+  const bool as_directory = matcher.matches_one_of(sel->dir_patterns, sel->separators);
+  const bool as_file = matcher.matches_one_of(sel->file_patterns, sel->separators);
+  if (!as_directory && !as_file) return 0;
+
+  zv::PathBuffer path;
+  struct _stat64 st;
+  if (!join(path, dir, name) || platform::status(path.c_str(), &st) != 0) return 0;
+  const bool is_directory = (st.st_mode & kind_mask) == directory_kind;
+  if (is_directory ? !as_directory : !as_file) return 0;
+  return sel->show_hidden != 0 || !platform::is_hidden(path.c_str());
+}

@@ -1,0 +1,94 @@
+// Searches through folders. The handle of a search is its record on the heap.
+#include <io.h>
+#include <windows.h>
+
+#include <cstdlib>
+#include <new>
+
+#include "frame/owner.h"
+#include "platform/platform.h"
+
+namespace zv::platform {
+
+namespace {
+
+// A search remembers its folder: only a search by full path tells what a reparse point is.
+struct Search {
+  TextBuffer<ZV_PATH_MAX + 1> folder;  // with a separator at its end, or empty
+  intptr_t handle = -1;
+  struct __finddata64_t found;
+};
+
+Search& search_of(intptr_t search) {
+  return *reinterpret_cast<Search*>(search);
+}
+
+// A reparse point that stands for another name is a link; any other is what its attributes say. One
+// that cannot be asked is not followed either.
+bool is_link(const char* path) {
+  constexpr DWORD name_surrogate = 0x20000000;
+  WIN32_FIND_DATAA found;
+  const HANDLE handle = FindFirstFileA(path, &found);
+  if (handle == INVALID_HANDLE_VALUE) return true;
+  FindClose(handle);
+  return (found.dwFileAttributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0 &&
+         (found.dwReserved0 & name_surrogate) != 0;
+}
+
+EntryKind kind_of(const char* path, DWORD attributes) {
+  if ((attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0 && is_link(path)) return EntryKind::link;
+  return (attributes & FILE_ATTRIBUTE_DIRECTORY) != 0 ? EntryKind::directory : EntryKind::other;
+}
+
+EntryKind kind_of_found(const Search& search) {
+  const DWORD attributes = search.found.attrib;
+  TextBuffer<ZV_PATH_MAX + sizeof search.found.name> path;
+  if ((attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0 &&
+      (!path.append(search.folder.view()) || !path.append(search.found.name)))
+    return EntryKind::unknown;
+  return kind_of(path.c_str(), attributes);
+}
+
+bool begin(Search& search, const char* directory) {
+  TextBuffer<ZV_PATH_MAX + 2> pattern;
+  if (!search.folder.append(directory)) return false;
+  if (!search.folder.empty() && search.folder.back() != '/' && !search.folder.append('/'))
+    return false;
+  if (!pattern.append(search.folder.view()) || !pattern.append('*')) return false;
+  search.handle = _findfirst64(pattern.c_str(), &search.found);
+  return search.handle != -1;
+}
+
+}  // namespace
+
+intptr_t search_first(const char* directory, Entry& entry) {
+  HeapPtr<void> block(std::malloc(sizeof(Search)));
+  if (block == nullptr) return no_search;
+  auto* const search = new (block.get()) Search;
+  if (!begin(*search, directory)) return no_search;
+  entry = {search->found.name, kind_of_found(*search)};
+  return reinterpret_cast<intptr_t>(block.release());
+}
+
+intptr_t search_below(intptr_t, const char*, const char* path, Entry& entry) {
+  return search_first(path, entry);
+}
+
+bool search_next(intptr_t search, Entry& entry) {
+  Search& going = search_of(search);
+  if (_findnext64(going.handle, &going.found) != 0) return false;
+  entry = {going.found.name, kind_of_found(going)};
+  return true;
+}
+
+void search_close(intptr_t search) {
+  const HeapPtr<Search> done(&search_of(search));
+  _findclose(done->handle);
+}
+
+EntryKind entry_kind(const char* path) {
+  const DWORD attributes = GetFileAttributesA(path);
+  return attributes != INVALID_FILE_ATTRIBUTES ? kind_of(path, attributes) : EntryKind::unknown;
+}
+
+}  // namespace zv::platform

@@ -1,0 +1,13 @@
+// What the machine can do. The system knows, and keeps it where every process can read it.
+#include <windows.h>
+
+#include "platform/platform.h"
+
+namespace zv::platform {
+
+bool has_wide_vectors() {
+  constexpr DWORD avx2_instructions = 40;  // PF_AVX2_INSTRUCTIONS_AVAILABLE
+  return IsProcessorFeaturePresent(avx2_instructions) != 0;
+}
+
+}  // namespace zv::platform

@@ -1,0 +1,102 @@
+// Chains of folders made, trees removed.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <string>
+
+#include "scratch_folder.h"
+#include "zarvo.h"
+
+namespace {
+
+TEST(MakePath, EveryFolderThatIsMissing) {
+  const ScratchFolder scratch;
+  EXPECT_EQ(zv_mkpath(scratch.path("x/y/z").c_str()), 1);
+  EXPECT_EQ(zv_mkpath(scratch.path("x/y/z").c_str()), 1);
+  EXPECT_EQ(zv_mkpath((scratch.path("x/w/v") + "/").c_str()), 1);
+  std::string backslashes = scratch.path("x") + "\\u\\t";
+  EXPECT_EQ(zv_mkpath(backslashes.c_str()), 1);
+  for (const char* made : {"x/y/z", "x/w/v", "x/u/t"})
+    EXPECT_TRUE(std::filesystem::is_directory(scratch.path(made))) << made;
+  EXPECT_EQ(zv_mkpath(""), 1);
+}
+
+TEST(MakePath, FilesOnTheWay) {
+  const ScratchFolder scratch;
+  const std::string file = scratch.make_file("x/file", "kept");
+  EXPECT_EQ(zv_mkpath(file.c_str()), 1);
+  EXPECT_EQ(zv_mkpath((file + "/below").c_str()), 0);
+  EXPECT_EQ(zv_mkpath((file + "/below/that").c_str()), 0);
+  EXPECT_EQ(scratch.content("x/file"), "kept");
+}
+
+TEST(MakePath, ALongPathIsRefusedNotCut) {
+  const ScratchFolder scratch;
+  std::string path = scratch.path("made");
+  while (path.size() < ZV_PATH_MAX) path += "/nnnnnnnnnnnnnnnnnnnnnnnnnnnnn";
+  EXPECT_EQ(zv_mkpath(path.c_str()), 0);
+  EXPECT_EQ(zv_mkfile(path.c_str()), 0);
+  EXPECT_FALSE(scratch.exists("made"));
+  EXPECT_EQ(zv_mkpath(path.substr(0, ZV_PATH_MAX - 1).c_str()), 1);
+  EXPECT_EQ(zv_rmpath(scratch.path("made").c_str()), 1);
+}
+
+TEST(MakeFile, WithItsFoldersAndEmpty) {
+  const ScratchFolder scratch;
+  EXPECT_EQ(zv_mkfile(scratch.path("d/e/f.txt").c_str()), 1);
+  EXPECT_TRUE(scratch.exists("d/e/f.txt"));
+  const std::string full = scratch.make_file("d/full", "content");
+  EXPECT_EQ(zv_mkfile(full.c_str()), 1);
+  EXPECT_EQ(scratch.content("d/full"), "");
+  EXPECT_EQ(zv_mkfile(scratch.path("d/e").c_str()), 0);       // a folder
+  EXPECT_EQ(zv_mkfile(scratch.path("d/full/x").c_str()), 0);  // a file on the way
+}
+
+TEST(RemovePath, AWholeTreeAndNothingElse) {
+  const ScratchFolder scratch;
+  scratch.make_file("top/a/b/c/file");
+  scratch.make_file("top/a/b2/file");
+  scratch.make_file("top/a/b/file");
+  scratch.make_file("top/.hidden");
+  scratch.make_folder("top/empty");
+  const std::string kept = scratch.make_file("topper/kept");
+  EXPECT_EQ(zv_rmpath(kept.c_str()), 0);
+  EXPECT_EQ(zv_rmpath(scratch.path("missing").c_str()), 0);
+  EXPECT_EQ(zv_rmpath(""), 0);
+  EXPECT_EQ(zv_rmpath((scratch.path("top") + "\\a//").c_str()), 1);
+  EXPECT_FALSE(scratch.exists("top/a"));
+  EXPECT_TRUE(scratch.exists("top/.hidden"));
+  EXPECT_EQ(zv_rmpath(scratch.path("top").c_str()), 1);
+  EXPECT_FALSE(scratch.exists("top"));
+  EXPECT_TRUE(scratch.exists("topper/kept"));
+}
+
+TEST(RemovePath, ALongPathIsRefusedNotCut) {
+  const ScratchFolder scratch;
+  scratch.make_file("top/file");
+  const std::string path = scratch.path("top") + std::string(ZV_PATH_MAX, '/');
+  EXPECT_EQ(zv_rmpath(path.c_str()), 0);
+  EXPECT_TRUE(scratch.exists("top/file"));
+}
+
+#ifndef _WIN32
+// Wine deletes what a link leads to, so no link is removed there.
+TEST(RemovePath, LinksAreRemovedThemselves) {
+  const ScratchFolder scratch;
+  scratch.make_file("outside/kept");
+  scratch.make_file("top/file");
+  std::filesystem::create_symlink("../outside", scratch.path("top/to-folder"));
+  std::filesystem::create_symlink("../outside/kept", scratch.path("top/to-file"));
+  std::filesystem::create_symlink("nowhere", scratch.path("top/dangling"));
+  std::filesystem::create_symlink("top", scratch.path("to-top"));
+
+  EXPECT_EQ(zv_rmpath(scratch.path("to-top").c_str()), 0);
+  EXPECT_EQ(zv_rmpath((scratch.path("to-top") + "/").c_str()), 0);
+  EXPECT_TRUE(scratch.exists("top/file"));
+  EXPECT_EQ(zv_rmpath(scratch.path("top").c_str()), 1);
+  EXPECT_FALSE(scratch.exists("top"));
+  EXPECT_TRUE(scratch.exists("outside/kept"));
+}
+#endif
+
+}  // namespace
