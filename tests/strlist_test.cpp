@@ -1,7 +1,6 @@
 // String lists.
 #include <gtest/gtest.h>
 
-#include <chrono>
 #include <cstdlib>
 #include <string>
 #include <vector>
@@ -218,28 +217,6 @@ TEST(StringList, LargeSetIsTheSame) {
     EXPECT_EQ(exact.texts(), without_duplicates(before, false));
     EXPECT_EQ(nocase.texts(), without_duplicates(before, true));
   }
-}
-
-// The shortest of several runs, so that a busy machine does not count.
-double best_seconds(unsigned count) {
-  const Texts before = repeating(count);
-  double best = 1e9;
-  for (int run = 0; run < 5; ++run) {
-    std::string joined;
-    for (const std::string& text : before) joined += text + ';';
-    List list;
-    zv_strlist_free(list.list, 0);
-    zv_strlist(&list.list, joined.c_str(), ';');
-    const auto start = std::chrono::steady_clock::now();
-    zv_strlist_iset(list.list, -1);
-    const std::chrono::duration<double> spent = std::chrono::steady_clock::now() - start;
-    best = std::min(best, spent.count());
-  }
-  return best;
-}
-
-TEST(StringList, SetOfManyIsNearLinear) {
-  EXPECT_LT(best_seconds(20000), 100 * best_seconds(1000));
 }
 
 }  // namespace

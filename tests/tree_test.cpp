@@ -37,7 +37,8 @@ TEST(MakePath, ALongPathIsRefusedNotCut) {
   EXPECT_EQ(zv_mkpath(path.c_str()), 0);
   EXPECT_EQ(zv_mkfile(path.c_str()), 0);
   EXPECT_FALSE(scratch.exists("made"));
-  EXPECT_EQ(zv_mkpath(path.substr(0, ZV_PATH_MAX - 1).c_str()), 1);
+  path.resize(240);  // Windows makes no folder beyond 247 characters
+  EXPECT_EQ(zv_mkpath(path.c_str()), 1);
   EXPECT_EQ(zv_rmpath(scratch.path("made").c_str()), 1);
 }
 
