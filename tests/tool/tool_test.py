@@ -68,6 +68,37 @@ class Tool(unittest.TestCase):
                 self.assertEqual(found[2] == "", code == 0 or words[0] in ("match", "path") and
                                  words[1] != "normalize", found[2])
 
+    def test_match_and_paths(self):
+        self.check([
+            (["match", "picture.png", "*.[pj][np]g"], 0, ""),
+            (["match", "picture.png", "*.PNG"], 1, ""),
+            (["match", "", ""], 0, ""),
+            (["match", "--", "-x", "-?"], 0, ""),
+            (["path", "normalize", r"a\.\b\..\\c\ "], 0, "a/c\n"),
+            (["path", "normalize", "D:/a/../.."], 1, ""),
+            (["path", "normalize", "a/$ZV_NO_SUCH_NAME/b"], 1, ""),
+            (["path", "absolute", "../lib/x.dll", "--base", "D:/app/bin"], 0, "D:/app/lib/x.dll\n"),
+            (["path", "absolute", "//srv/share/x", "--base", "D:/app"], 0, "//srv/share/x\n"),
+            (["path", "relative", "/a/b/f.txt", "--base", "/a/c"], 0, "../b/f.txt\n"),
+            (["path", "relative", "D:/a", "--base", "D:/A"], 0, ".\n"),
+            (["path", "split", "//srv/share/a/b"], 0, "//srv/share/\na\nb\n"),
+        ])
+        code, _, message = self.zv("path", "split", "x" * 320)
+        self.assertEqual(code, 1)
+        self.assertIn("319", message)
+
+    def test_scan(self):
+        self.check([
+            (["scan", "tree"], 0, "a.TXT\nb.txt\nsub\n"),
+            (["scan", "tree", "--files", "*.txt"], 0, "a.TXT\nb.txt\n"),
+            (["scan", "tree", "--files", "*.txt", "--match-case"], 0, "b.txt\n"),
+            (["scan", "tree", "--dirs", "s*"], 0, "sub\n"),
+            (["scan", "tree/", "--recursive", "--files", "*.bin;a*"], 0,
+             "tree/a.TXT\ntree/sub/x.bin\n"),
+            (["scan", "no-such"], 1, ""),
+            (["scan", "tree/b.txt"], 1, ""),
+        ])
+
     def test_copy(self):
         self.check([
             (["copy", "tree/b.txt", "copied"], 0, ""),
@@ -103,6 +134,21 @@ class Tool(unittest.TestCase):
             self.assertEqual("2.0 MB" in shown, not quiet, shown)
             self.assertRegex(shown, r"(^|\r {5,}\r)#$")  # and nothing of it is left
 
+    def test_remove_asks_first(self):
+        code, output, message = self.zv("rm", "tree")  # no terminal here
+        self.assertEqual((code, output), (1, ""))
+        self.assertIn("--yes", message)
+        self.assertTrue((work / "tree/sub/deep.txt").exists())
+        self.check([
+            (["rm", "/", "--yes"], 1, ""),
+            (["rm", "./", "--yes"], 1, ""),
+            (["rm", "tree/..", "--yes"], 1, ""),
+            (["rm", "tree/b.txt", "--yes"], 1, ""),
+            (["rm", "tree", "--yes"], 0, ""),
+            (["rm", "tree", "--yes"], 1, ""),
+        ])
+        self.assertFalse((work / "tree").exists())
+
     def test_info_and_usage(self):
         code, output, _ = self.zv("info")
         self.assertEqual(code, 0)
@@ -111,7 +157,7 @@ class Tool(unittest.TestCase):
         self.assertEqual(self.zv("--version"), (0, "zv 1.0.0b\n", ""))
         self.assertIn("copy", self.zv("--help")[1])
         for words in ([], ["no-such"], ["copy", "one"], ["copy", "a", "b", "c"], ["match", "a"],
-                      ["copy", "a", "b", "--retries", "-1"]):
+                      ["copy", "a", "b", "--retries", "-1"], ["path"]):
             with self.subTest(words):
                 code, output, message = self.zv(*words)
                 self.assertEqual((code, output), (2, ""))

@@ -78,11 +78,45 @@ void add_copy(Program& program) {
           "The exit code is 3 when the source failed and 4 when the destination did.");
 }
 
+void add_scan(Program& program) {
+  add(program, "scan", "List a folder: everything, or what matches the patterns given", scan)
+      .needs("FOLDER", &ScanOptions::folder, "where to look")
+      .takes("--files", &ScanOptions::files, "PATTERNS",
+             "the files that match, such as '*.png;*.jpg'")
+      .takes("--dirs", &ScanOptions::folders, "PATTERNS", "the folders that match")
+      .flag("--recursive", &ScanOptions::recursive, "everything below the folder, as full paths")
+      .flag("--hidden", &ScanOptions::hidden, "hidden entries too")
+      .flag("--match-case", &ScanOptions::match_case, "tell capital from small letters");
+}
+
 void add_match(Program& program) {
   add(program, "match", "Tell whether a text matches a wildcard pattern", match)
       .needs("TEXT", &MatchOptions::text, "the whole of it must match")
       .needs("PATTERN", &MatchOptions::pattern, "* ? [a-z] [^a-z], and \\ before a plain sign")
       .note("Prints nothing; the exit code is 0 for a match and 1 for none.");
+}
+
+void add_path(Program& program) {
+  CLI::App& group = *program.app.add_subcommand("path", "Work out a path");
+  group.require_subcommand(1);
+  const auto add = [&](const char* name, const char* purpose, int (*run)(const PathOptions&)) {
+    return Command<PathOptions>(program, group, name, purpose, run)
+        .needs("PATH", &PathOptions::path, "");
+  };
+  const char* const base_help = "instead of the current folder";
+  add("normalize", "Resolve . and .., ~, %NAME% and $NAME, and write every separator as /",
+      path_normalize);
+  add("absolute", "Resolve a relative path against a base", path_absolute)
+      .takes("--base", &PathOptions::base, "FOLDER", base_help);
+  add("relative", "Say how a path is reached from a base; both are absolute", path_relative)
+      .takes("--base", &PathOptions::base, "FOLDER", base_help);
+  add("split", "Print a path's root and each component", path_split);
+}
+
+void add_remove(Program& program) {
+  add(program, "rm", "Remove a folder and everything in it", remove)
+      .needs("FOLDER", &RemoveOptions::folder, "")
+      .flag("--yes", &RemoveOptions::agreed, "ask nothing");
 }
 
 void add_info(Program& program) {
@@ -97,7 +131,8 @@ int run_command_line(int argc, char** argv) {
   program.app.set_version_flag("--version", std::string("zv ") + zarvo_version(),
                                "Print the version and exit");
   program.app.require_subcommand(1);
-  for (const auto add_command : {add_copy, add_match, add_info}) add_command(program);
+  for (const auto add_command : {add_copy, add_scan, add_match, add_path, add_remove, add_info})
+    add_command(program);
   try {
     program.app.parse(argc, argv);
   } catch (const CLI::Success& wanted) {  // help, or the version

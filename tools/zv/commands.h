@@ -3,7 +3,6 @@
 #ifndef ZV_TOOL_COMMANDS_H
 #define ZV_TOOL_COMMANDS_H
 
-#include <climits>
 #include <string>
 
 namespace tool {
@@ -19,11 +18,36 @@ struct CopyOptions {
 };
 int copy(const CopyOptions& options);
 
+struct ScanOptions {
+  std::string folder;
+  std::string files;
+  std::string folders;
+  bool recursive = false;
+  bool hidden = false;
+  bool match_case = false;
+};
+int scan(const ScanOptions& options);
+
 struct MatchOptions {
   std::string text;
   std::string pattern;
 };
 int match(const MatchOptions& options);
+
+struct PathOptions {
+  std::string path;
+  std::string base;  // empty: the current folder
+};
+int path_normalize(const PathOptions& options);
+int path_absolute(const PathOptions& options);
+int path_relative(const PathOptions& options);
+int path_split(const PathOptions& options);
+
+struct RemoveOptions {
+  std::string folder;
+  bool agreed = false;
+};
+int remove(const RemoveOptions& options);
 
 struct InfoOptions {};
 int info(const InfoOptions& options);

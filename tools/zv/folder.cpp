@@ -1,0 +1,37 @@
+// See folder.h.
+#include "folder.h"
+
+#include <algorithm>
+#include <string_view>
+
+#include "commands.h"
+
+namespace tool {
+namespace {
+
+int select(const char* folder, const char* name, void* selection) {
+  return zv_dir_select(folder, name, static_cast<const dirsel_t*>(selection));
+}
+
+}  // namespace
+
+bool is_folder(const std::string& path) {
+  struct _stat64 status = {};
+  if (zv_stat(path.c_str(), &status) == 0 && (status.st_mode & S_IFMT) == S_IFDIR) return true;
+  complain("there is no folder " + path);
+  return false;
+}
+
+bool Listing::scan(const std::string& folder, dirsel_t* selection, bool recursive) {
+  const int count = zv_dir_scan(folder.c_str(), &list_, selection != nullptr ? select : nullptr,
+                                selection, recursive, recursive);
+  if (count < 0) {
+    complain("an entry below " + folder + " cannot be examined");
+    return false;
+  }
+  count_ = static_cast<size_t>(count);
+  std::ranges::sort(names(), {}, [](const char* name) { return std::string_view(name); });
+  return true;
+}
+
+}  // namespace tool

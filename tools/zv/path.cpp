@@ -1,0 +1,60 @@
+// zv path: the path algebra, one operation a subcommand.
+#include <cstdio>
+#include <cstring>
+
+#include "commands.h"
+#include "path_text.h"
+
+namespace tool {
+namespace {
+
+const char* base_of(const PathOptions& options) {
+  return options.base.empty() ? nullptr : options.base.c_str();
+}
+
+}  // namespace
+
+int path_normalize(const PathOptions& options) {
+  PathText path;
+  if (!path.assign(options.path)) return no;
+  if (zv_normalize_path(path.data()) == 0) {
+    complain("cannot be normalised: " + options.path);
+    return no;
+  }
+  std::puts(path.c_str());
+  return done;
+}
+
+int path_absolute(const PathOptions& options) {
+  PathText path;
+  if (!path.assign(options.path)) return no;
+  if (zv_ispath_relative(path.c_str()) != 0 &&
+      zv_absolute(path.c_str(), base_of(options), path.data(), PathText::size()) == 0) {
+    complain("leads to no place: " + options.path);
+    return no;
+  }
+  std::puts(path.c_str());
+  return done;
+}
+
+int path_relative(const PathOptions& options) {
+  PathText path;
+  if (!path.assign(options.path)) return no;
+  if (zv_relative(path.c_str(), base_of(options), path.data(), PathText::size()) == 0) {
+    complain("has nothing in common with the base: " + options.path);
+    return no;
+  }
+  std::puts(*path.c_str() == '\0' ? "." : path.c_str());
+  return done;
+}
+
+int path_split(const PathOptions& options) {
+  PathText path;
+  if (!path.assign(options.path)) return no;
+  zv_split_path(path.data());
+  for (const char* piece = path.c_str(); *piece != '\0'; piece += std::strlen(piece) + 1)
+    std::puts(piece);
+  return done;
+}
+
+}  // namespace tool
