@@ -5,6 +5,7 @@
 #include <string>
 
 #include "environment.h"
+#include "guarded.h"
 #include "scratch_folder.h"
 #include "zarvo.h"
 
@@ -75,12 +76,11 @@ struct PieceCase {
 };
 
 std::string split(const char* path) {
-  char text[64];
-  std::memset(text, '?', sizeof text);
-  std::strcpy(text, path);
-  zv_split_path(text);
+  Guarded text(path, 2);  // the room for two characters more that splitting may take
+  zv_split_path(text.data());
+  EXPECT_TRUE(text.intact()) << path;
   std::string pieces;
-  for (const char* piece = text; *piece != '\0'; piece += std::strlen(piece) + 1)
+  for (const char* piece = text.text(); *piece != '\0'; piece += std::strlen(piece) + 1)
     pieces += std::string(piece) + '|';
   return pieces;
 }

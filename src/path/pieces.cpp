@@ -64,7 +64,8 @@ void zv_split_path(char* path) {
   const size_t root = zv::root_size({path, size});
   char* rest = path + root;
   char* end = path + size;
-  if (root != 0) {
+  // A root alone is closed where it ends: a share that got its separator has no room for more.
+  if (root != 0 && root != size) {
     std::memmove(rest + 1, rest, size - root);
     *rest++ = '\0';
     ++end;

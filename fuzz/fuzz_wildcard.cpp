@@ -1,0 +1,18 @@
+// The wildcard matcher beside its definition.
+#include <fuzzer/FuzzedDataProvider.h>
+
+#include <string>
+
+#include "check.h"
+#include "wildcard_definition.h"
+#include "zarvo.h"
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+  // The definition takes exponential time where its rule for giving up does not help.
+  FuzzedDataProvider provider(data, size);
+  const std::string pattern = provider.ConsumeRandomLengthString(24).c_str();
+  const std::string text = provider.ConsumeRandomLengthString(40).c_str();
+  const bool expected = WildcardDefinition::matches(text, pattern);
+  CHECK(zv_strpat(text.c_str(), pattern.c_str()) == (expected ? 1 : 0));
+  return 0;
+}
