@@ -5,6 +5,7 @@
 #include <string_view>
 
 #include "commands.h"
+#include "path_text.h"
 
 namespace tool {
 namespace {
@@ -17,7 +18,10 @@ int select(const char* folder, const char* name, void* selection) {
 
 bool is_folder(const std::string& path) {
   struct _stat64 status = {};
-  if (zv_stat(path.c_str(), &status) == 0 && (status.st_mode & S_IFMT) == S_IFDIR) return true;
+  PathText folder;
+  if (!folder.assign(path)) return false;
+  zv_trim_slash(folder.data());  // Windows finds nothing under a name that ends with one
+  if (zv_stat(folder.c_str(), &status) == 0 && (status.st_mode & S_IFMT) == S_IFDIR) return true;
   complain("there is no folder " + path);
   return false;
 }

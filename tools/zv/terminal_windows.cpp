@@ -1,8 +1,10 @@
-// The terminal on Windows.
+// The terminal on Windows. _isatty() would take the empty device for one: any device is to it.
 #include <io.h>
+#include <windows.h>
 
 #include "terminal.h"
 
 bool tool::is_terminal(std::FILE* stream) {
-  return _isatty(_fileno(stream)) != 0;
+  DWORD mode = 0;
+  return GetConsoleMode(reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(stream))), &mode) != 0;
 }
