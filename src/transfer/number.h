@@ -22,7 +22,8 @@ bool take_number(std::string_view& text, Number& number) {
   using Limits = std::numeric_limits<Number>;
   while (!text.empty() && is_space(text.front())) text.remove_prefix(1);
   const bool negative = text.starts_with('-');
-  if (text.starts_with('+') && !text.starts_with("+-")) text.remove_prefix(1);
+  const bool two_signs = text.size() > 1 && text[1] == '-';
+  if (text.starts_with('+') && !two_signs) text.remove_prefix(1);
   number = 0;
   const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), number);
   text.remove_prefix(static_cast<size_t>(end - text.data()));
