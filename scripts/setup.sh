@@ -8,7 +8,7 @@ test_packages=("${build_packages[@]}" "${server_packages[@]}" attr valgrind)
 windows_packages=(g++-mingw-w64-x86-64-posix wine64 llvm)
 lint_packages=(clang clang-format clang-tidy libclang-rt-14-dev cppcheck shellcheck)
 docs_packages=(doxygen)
-package_packages=(dpkg-dev file gzip man-db util-linux)
+package_packages=(dpkg-dev file gzip man-db util-linux abigail-tools)
 
 fail() {
     printf '%s: %s\n' "${0##*/}" "$*" >&2
