@@ -1,5 +1,7 @@
 // The removal of a tree: listed whole, then removed from the last entry to the first, so that
 // content goes before its folder. Each entry is removed relative to its folder, which is held open.
+#include <algorithm>
+
 #include "file/scan.h"
 #include "path/form.h"
 #include "platform/platform.h"
@@ -47,9 +49,14 @@ class FolderChain {
     if (open()) path_.shorten(innermost().path_size);
   }
 
+  bool lies_within(std::string_view path) const {
+    const std::string_view start = path_.view();
+    return path.size() >= start.size() && std::equal(start.begin(), start.end(), path.begin());
+  }
+
   // Makes `folder`, a path with a separator at its end, the innermost one.
   bool reach(std::string_view folder) {
-    while (depth_ > 1 && !folder.starts_with(path_.view())) pop();
+    while (depth_ > 1 && !lies_within(folder)) pop();
     while (path_.size() < folder.size())
       if (!descend({folder.data(), folder.find('/', path_.size()) + 1})) return false;
     return true;
