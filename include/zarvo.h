@@ -1799,7 +1799,7 @@ char* zv_fmt_force(const char* entry, char* name);
  * | `ftp://[user[:password]@]host[:port]/path` | a file on an FTP server, port 21 |
  * | `http://[user[:password]@]host[:port]/path` | a resource of a web server, port 80 |
  * | `smtp://[user[:password]@]host[:port]/recipient` | a mail to an address, port 25 |
- * | `file://path` | a local file; `file:///D:/f` and `file:///D|/f` name `D:/f` |
+ * | `file://path` | a local file; `file:///D:/f` names `D:/f` |
  * | anything else | a local path, in either separator style |
  *
  * The last `@` before the first `/` ends the credentials, so a user may hold one (`u@d:pw@host`).
