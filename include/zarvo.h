@@ -1059,12 +1059,77 @@ ZV_API int zv_absolute(const char* path, const char* base, char* out, size_t siz
  */
 ZV_API int zv_relative(const char* path, const char* base, char* out, size_t size);
 
-int zv_pathmap(const char* from, const char* to);
-void zv_pathmap_clear(void);
-int zv_pathmap_locate(char* path);
+/**
+ * Record in the path map that the files of one folder now lie in another.
+ *
+ * The last component of both arguments is dropped: they name files, or folders whose parents are
+ * meant. A new target replaces the one that was recorded for the same folder, byte for byte.
+ *
+ * @param from a path in the former folder, in canonical form. With no folder in it the record is
+ *             kept but never used.
+ * @param to   a path in the new folder, in canonical form; with no folder in it the working
+ *             directory is meant, as it is now.
+ * @return 1 if something was recorded; 0 if the folders are the same or the record was there
+ *         already, and on failure: memory ran out or the working directory cannot be had.
+ * @par Thread safety
+ *   Safe from any thread: holds the path map's own lock.
+ */
+ZV_API int zv_pathmap(const char* from, const char* to);
 
-int zv_pathlist(char*** list);
-int zv_path_locate(char* path);
+/**
+ * Forget all records of the path map.
+ *
+ * @par Thread safety
+ *   Safe from any thread: holds the path map's own lock.
+ */
+ZV_API void zv_pathmap_clear(void);
+
+/**
+ * Find a file that may have moved.
+ *
+ * A path that exists is left alone. Otherwise each record is tried, oldest first: the path's folder
+ * is taken relative to the record's former folder, without regard to case, and looked for at the
+ * same place from the new one. That holds above the former folder too: after `D:/data/in` has
+ * become `E:/x/in`, `D:/data/other` is looked for as `E:/x/other`. A lone name is never redirected,
+ * and a candidate of more than 319 characters is passed over.
+ *
+ * @param path the path, in canonical form, in a buffer of #ZV_PATH_MAX bytes.
+ * @return 1 if the path exists, or now names the first candidate that does; 0 if none exists,
+ *         `path` being unchanged.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers: holds the path map's own lock while the candidates
+ *   are looked for on disk.
+ */
+ZV_API int zv_pathmap_locate(char* path);
+
+/**
+ * List the folders of the search path, the variable `PATH` of the process environment.
+ *
+ * Its elements are separated by `;`, on Linux by `:` where the value holds no `;`. They come in
+ * their order with `/` as the separator, a last `/` kept, and on Windows in their long form. An
+ * element that has none stays as written, and an empty element stays empty.
+ *
+ * @param list receives the list, to be given back with zv_strlist_free().
+ * @return how many folders; 0 when the variable is not set or empty or memory ran out, `list` being
+ *         untouched.
+ * @par Thread safety
+ *   Safe from any thread while none changes the process environment.
+ */
+ZV_API int zv_pathlist(char*** list);
+
+/**
+ * Find a file by its name in the folders of the search path, in their order.
+ *
+ * Only the last component of the path counts. The working directory is not searched, no extension
+ * is added, and a folder of that name counts as found. A candidate of more than 319 characters is
+ * passed over.
+ *
+ * @param path the name, in a buffer of #ZV_PATH_MAX bytes.
+ * @return 1 if `path` now names the first that exists; 0 if none does, `path` being unchanged.
+ * @par Thread safety
+ *   Safe from any thread, for distinct buffers, while none changes the process environment.
+ */
+ZV_API int zv_path_locate(char* path);
 
 /** @} */
 

@@ -1,4 +1,6 @@
 // The pieces of a path: its last separator, its extension, its folder and name, its components.
+#include "path/pieces.h"
+
 #include <algorithm>
 #include <cstring>
 
@@ -28,6 +30,27 @@ std::string_view last_component(std::string_view path) {
 }
 
 }  // namespace
+
+namespace zv {
+
+void folder_of(const char* path, PathBuffer& out) {
+  out.assign_cut(path);
+  if (!trim_slash(out) || !cut_to_folder(out)) out.clear();
+}
+
+void file_name(const char* path, PathBuffer& out) {
+  out.assign_cut(path);
+  if (!trim_slash(out) || is_root(out.view())) out.clear();
+  const std::string_view name = last_component(out.view());
+  if (is_dot_or_dots(name) || !out.assign(name)) out.clear();
+}
+
+bool append_name(PathBuffer& folder, std::string_view name) {
+  if (!folder.empty() && folder.back() != '/' && !folder.append('/')) return false;
+  return folder.append(name);
+}
+
+}  // namespace zv
 
 char* zv_slash(const char* path) {
   const char* const slash = std::strrchr(path, '/');
@@ -76,17 +99,14 @@ void zv_split_path(char* path) {
 
 int zv_extract_directory(const char* path, char* out, size_t size) {
   zv::PathBuffer folder;
-  folder.assign_cut(path);
-  if (!zv::trim_slash(folder) || !cut_to_folder(folder)) folder.clear();
-  return zv_strncpy(out, folder.c_str(), size) != 0;
+  zv::folder_of(path, folder);
+  return zv::put(folder.view(), out, size);
 }
 
 int zv_extract_filename(const char* path, char* out, size_t size) {
-  zv::PathBuffer text;
-  text.assign_cut(path);
-  if (!zv::trim_slash(text) || zv::is_root(text.view())) text.clear();
-  const std::string_view name = last_component(text.view());
-  return zv_strncpy(out, is_dot_or_dots(name) ? "" : name.data(), size) != 0;
+  zv::PathBuffer name;
+  zv::file_name(path, name);
+  return zv::put(name.view(), out, size);
 }
 
 int zv_extract_extension(const char* path, char* out, size_t size) {

@@ -34,7 +34,7 @@ bool set_hidden(const char* path, bool hidden);
 bool working_directory(PathBuffer& out, size_t limit);  // `limit`: bytes offered to the platform
 bool drive_directory(int drive, PathBuffer& out);       // drive 1 is A
 int current_drive();                                    // 0 where there are no drives
-bool long_path(const char* path, PathBuffer& out);      // false unless the path exists and fits
+bool long_path(const char* path, PathBuffer& out);      // false where it cannot be had
 const char* temp_folder();                              // nullptr when none is named
 char search_path_separator(const char* search_path);    // between the elements of "PATH"
 

@@ -23,8 +23,9 @@ int current_drive() {
   return 0;
 }
 
+// There is one form of a name only.
 bool long_path(const char* path, PathBuffer& out) {
-  return ::access(path, F_OK) == 0 && out.assign(path);
+  return out.assign(path);
 }
 
 // On Windows an empty variable cannot exist; here it names nothing.

@@ -1,0 +1,20 @@
+// The pieces of a path inside the library, in buffers.
+#ifndef ZARVO_PATH_PIECES_H
+#define ZARVO_PATH_PIECES_H
+
+#include <string_view>
+
+#include "frame/text_buffer.h"
+
+namespace zv {
+
+// What zv_extract_directory() and zv_extract_filename() take out.
+void folder_of(const char* path, PathBuffer& out);
+void file_name(const char* path, PathBuffer& out);
+
+// Puts a name behind a folder, which may be empty. False when it does not fit.
+[[nodiscard]] bool append_name(PathBuffer& folder, std::string_view name);
+
+}  // namespace zv
+
+#endif
