@@ -1,4 +1,5 @@
 // The one transfer operation: picks the road between two locations.
+#include "transfer/ftp.h"
 #include "transfer/http.h"
 #include "transfer/local.h"
 #include "transfer/location.h"
@@ -13,6 +14,8 @@ int download(const location_t& source, const char* local) {
   const char* const password = source.password.c_str();
   const char* const path = source.path.c_str();
   switch (source.kind) {
+    case zv::LOC_FTP:
+      return zv::ftp_download(source.addr, source.port, user, password, path, local);
     case zv::LOC_HTTP:
       return zv::http_get(source.addr, source.port, user, password, path, local);
     default:
@@ -25,6 +28,8 @@ int upload(const char* local, const location_t& destination) {
   const char* const password = destination.password.c_str();
   const char* const path = destination.path.c_str();
   switch (destination.kind) {
+    case zv::LOC_FTP:
+      return zv::ftp_upload(destination.addr, destination.port, user, password, local, path);
     case zv::LOC_HTTP:
       return zv::http_put(destination.addr, destination.port, user, password, local, path);
     default:

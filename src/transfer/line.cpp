@@ -18,9 +18,4 @@ bool send_all(platform::Socket socket, std::string_view bytes) {
   return true;
 }
 
-bool send_line(platform::Socket socket, Pieces pieces) {
-  LineBuffer line;
-  return build_line(line, pieces) && send_all(socket, line.view());
-}
-
 }  // namespace zv

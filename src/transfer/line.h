@@ -18,11 +18,13 @@ using Pieces = std::initializer_list<std::string_view>;
 // False when the line does not fit.
 [[nodiscard]] bool build_line(LineBuffer& line, Pieces pieces);
 
+// What no line and no text that goes into one may hold.
+inline bool holds_line_end(std::string_view text) {
+  return text.find_first_of("\r\n") != std::string_view::npos;
+}
+
 // Sends all of it: a send that a signal cut short goes on where it stopped.
 [[nodiscard]] bool send_all(platform::Socket socket, std::string_view bytes);
-
-// Builds a line and sends it. The pieces hold the line's end too.
-[[nodiscard]] bool send_line(platform::Socket socket, Pieces pieces);
 
 }  // namespace zv
 

@@ -5,6 +5,7 @@
 #include <string_view>
 
 #include "transfer/connection.h"
+#include "transfer/line.h"
 #include "transfer/number.h"
 
 namespace zv {
@@ -61,15 +62,11 @@ bool split_credentials(std::string_view text, size_t colon, location_t& location
          location.password.assign(between(text, password_begin, text.size()));
 }
 
-bool has_line_end(const PathBuffer& text) {
-  return text.view().find_first_of("\r\n") != std::string_view::npos;
-}
-
 bool parse_network(location_t& location) {
   if (!split_authority(location)) return false;
   location.path.edit_shrinking(percent_decode);
-  return !has_line_end(location.path) && !has_line_end(location.user) &&
-         !has_line_end(location.password);
+  return !holds_line_end(location.path.view()) && !holds_line_end(location.user.view()) &&
+         !holds_line_end(location.password.view());
 }
 
 // "/D|/dir" and "/D:/dir" are how a path with a drive stands behind "file://".
