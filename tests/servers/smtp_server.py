@@ -53,7 +53,7 @@ async def serve(folder, user, password):
 
     def check(server, session, envelope, mechanism, data):
         good = data == LoginPassword(user.encode(), password.encode())
-        return AuthResult(success=good, auth_data=data)
+        return AuthResult(success=good, handled=False, auth_data=data)
 
     def protocol(refused):
         return lambda: SMTP(keeper, hostname="localhost", data_size_limit=0, authenticator=check,
