@@ -3,6 +3,7 @@
 #ifndef ZARVO_PLATFORM_PLATFORM_H
 #define ZARVO_PLATFORM_PLATFORM_H
 
+#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <cstdio>
@@ -43,6 +44,17 @@ char search_path_separator(const char* search_path);    // between the elements 
 bool user_name(TextBuffer<257>& out);
 bool host_name(TextBuffer<16>& out);
 bool home_folder(PathBuffer& out);  // as the platform writes it
+
+// ---- letter_case.cpp: case in the current locale, byte by byte ----------------------------------
+
+// What tolower() or toupper() makes of each byte: the platform's own table, or `room` filled.
+using ByteMap = std::array<int32_t, 256>;
+const int32_t* lower_map(ByteMap& room);
+const int32_t* upper_map(ByteMap& room);
+
+// The order of two texts, or of their first `n` bytes: unsigned, after tolower().
+int compare_without_case(const char* a, const char* b);
+int compare_without_case(const char* a, const char* b, size_t n);
 
 // ---- clock.cpp: local time ----------------------------------------------------------------------
 

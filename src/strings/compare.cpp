@@ -1,53 +1,45 @@
-// Case, and comparison and search without regard to it. Case is the current locale's, byte by byte.
-#include <cctype>
+// Comparison and search without regard to case. Case is the current locale's, byte by byte.
 #include <cstring>
+#include <string_view>
 
+#include "platform/platform.h"
+#include "strings/search.h"
 #include "zarvo.h"
 
 namespace {
 
-int lower(char ch) {
-  return std::tolower(static_cast<unsigned char>(ch));
+// Searches through a window that widens as it moves on, so that what lies far behind an early find
+// is not even measured.
+char* find_in_windows(const char* s, std::string_view needle) {
+  constexpr size_t first_window = 512;
+  zv::platform::ByteMap room;
+  const int32_t* const lower = zv::platform::lower_map(room);
+  for (size_t window = first_window + needle.size();; window *= 2) {
+    const void* const nul = std::memchr(s, '\0', window);
+    const size_t length =
+        nul != nullptr ? static_cast<size_t>(static_cast<const char*>(nul) - s) : window;
+    const char* const found = zv::find_without_case({s, length}, needle, lower);
+    if (found != nullptr) return const_cast<char*>(found);
+    if (nul != nullptr) return nullptr;
+    s += length - needle.size() + 1;
+  }
 }
 
 }  // namespace
 
-size_t zv_strlwr(char* s) {
-  const size_t length = std::strlen(s);
-  for (size_t i = 0; i < length; ++i) s[i] = static_cast<char>(lower(s[i]));
-  return length;
-}
-
-size_t zv_strupr(char* s) {
-  const size_t length = std::strlen(s);
-  for (size_t i = 0; i < length; ++i)
-    s[i] = static_cast<char>(std::toupper(static_cast<unsigned char>(s[i])));
-  return length;
-}
-
 int zv_stricmp(const char* a, const char* b) {
-  return zv_strnicmp(a, b, SIZE_MAX);
+  return zv::platform::compare_without_case(a, b);
 }
 
 int zv_strnicmp(const char* a, const char* b, size_t n) {
-  for (size_t i = 0; i < n; ++i) {
-    const int difference = a[i] == b[i] ? 0 : lower(a[i]) - lower(b[i]);
-    if (difference != 0 || a[i] == '\0') return difference;
-  }
-  return 0;
+  return zv::platform::compare_without_case(a, b, n);
 }
 
 char* zv_strichr(const char* s, int ch) {
-  const int wanted = lower(static_cast<char>(ch));
-  for (; *s != '\0'; ++s)
-    if (lower(*s) == wanted) return const_cast<char*>(s);
-  return nullptr;
+  const char wanted = static_cast<char>(ch);
+  return wanted != '\0' ? find_in_windows(s, {&wanted, 1}) : nullptr;
 }
 
 char* zv_stristr(const char* s, const char* needle) {
-  const size_t length = std::strlen(needle);
-  if (length == 0) return nullptr;
-  for (s = zv_strichr(s, needle[0]); s != nullptr; s = zv_strichr(s + 1, needle[0]))
-    if (zv_strnicmp(s, needle, length) == 0) return const_cast<char*>(s);
-  return nullptr;
+  return *needle != '\0' ? find_in_windows(s, needle) : nullptr;
 }

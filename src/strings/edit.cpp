@@ -6,8 +6,10 @@
 
 namespace {
 
+// No locale has white space among the graphic characters of ASCII, nor takes it from the blank.
 bool is_space(char ch) {
-  return std::isspace(static_cast<unsigned char>(ch)) != 0;
+  if (ch > ' ' && ch <= '~') return false;
+  return ch == ' ' || std::isspace(static_cast<unsigned char>(ch)) != 0;
 }
 
 // The length of the text without the white space at its end.

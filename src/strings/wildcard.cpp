@@ -1,14 +1,15 @@
 // Wildcard patterns.
 //
-// A pattern is a row of runs with stars between them. A star that is reached ends all doubt about
-// the runs before it: whatever the rest of the text can match from a later place, it can match from
-// the earliest. So each run is taken at the first place where it matches, only the last star is
-// ever tried again, and neither recursion nor heap is needed. Once the text ends before the pattern
-// does, or the pattern turns out malformed, no other place can help: the match is given up.
+// A pattern is a row of runs with stars between them. What follows a star either matches or makes
+// the match hopeless: a run that merely differs is tried again from the star's next place. So once
+// a run has matched up to a further star, the stars before it are settled, only the last one is
+// ever tried again, and neither recursion nor heap is needed. The match is given up as hopeless
+// once the text ends before the pattern does, or the pattern turns out malformed.
 #include <bit>
 #include <cstring>
 #include <string_view>
 
+#include "strings/search.h"
 #include "zarvo.h"
 
 namespace {
@@ -26,8 +27,9 @@ bool is_continuation(char ch) {
 // two to six bytes of UTF-8, of any value, or else the one byte.
 Character decode(const char* p) {
   const auto byte = static_cast<unsigned char>(*p);
+  if (byte < 0xC0) return {byte, 1};
   const int ones = std::countl_one(byte);
-  if (ones < 2 || ones > 6) return {byte, 1};
+  if (ones > 6) return {byte, 1};
   uint32_t value = byte & (0x7FU >> ones);
   for (int i = 1; i < ones; ++i) {
     if (!is_continuation(p[i])) return {byte, 1};
@@ -36,28 +38,55 @@ Character decode(const char* p) {
   return {value, ones};
 }
 
-// Whether a set's members, those between its brackets and behind its ^, hold the character.
-bool holds(std::string_view members, uint32_t value) {
-  const char* p = members.data();
-  const char* const end = p + members.size();
-  uint32_t first = 0;
-  bool may_start_range = false;
-  while (p != end) {
-    const bool range = may_start_range && *p == '-' && p + 1 != end;
-    if (range) ++p;
-    const Character member = decode(p);
-    p += member.length;
-    if (!range) first = member.value;
-    if (first <= value && value <= member.value) return true;
-    may_start_range = !range;
+// A set, from its opening bracket on.
+class Set {
+ public:
+  explicit Set(const char* bracket)
+      : negated_(bracket[1] == '^'), members_(bracket + (negated_ ? 2 : 1)) {
+    if (*members_ == '\0') return;
+    const char* end = members_ + 1;  // the first member may be the bracket itself
+    while (*end != ']' && *end != '\0') ++end;
+    if (*end == ']') close_ = end;
   }
-  return false;
+
+  bool closed() const { return close_ != nullptr; }
+  const char* end() const { return close_ + 1; }
+  bool takes(uint32_t value) const { return holds(value) != negated_; }
+
+ private:
+  bool holds(uint32_t value) const {
+    uint32_t first = 0;
+    bool may_start_range = false;
+    for (const char* p = members_; p != close_;) {
+      const bool range = may_start_range && *p == '-' && p + 1 != close_;
+      if (range) ++p;
+      const Character member = decode(p);
+      p += member.length;
+      if (!range) first = member.value;
+      if (first <= value && value <= member.value) return true;
+      may_start_range = !range;
+    }
+    return false;
+  }
+
+  bool negated_;
+  const char* members_;
+  const char* close_ = nullptr;
+};
+
+// The literal text that a pattern begins with.
+std::string_view literal_head(const char* pattern) {
+  return {pattern, std::strcspn(pattern, "*?[\\")};
 }
 
-// The end of the literal text that the pattern ends with. A byte of it may stand behind a `\`,
+// The start of the literal text that a pattern ends with. A byte of it may stand behind a `\`,
 // which changes nothing, or in a set without its bracket, which matches nothing anyway.
-const char* literal_tail(std::string_view pattern) {
-  return pattern.data() + pattern.find_last_of("*?[]\\") + 1;  // npos + 1 is 0: all of it
+const char* literal_tail(const char* pattern, const char* end) {
+  const auto is_special = [](char ch) {
+    return ch == '*' || ch == '?' || ch == '[' || ch == ']' || ch == '\\';
+  };
+  while (end != pattern && !is_special(end[-1])) --end;
+  return end;
 }
 
 enum class Outcome { matched, differs, given_up };
@@ -69,10 +98,11 @@ class Matcher {
         text_end_(text_ + text.size()),
         pattern_(pattern.data()),
         pattern_end_(pattern_ + pattern.size()),
-        tail_(literal_tail(pattern)) {}
+        tail_(literal_tail(pattern_, pattern_end_)) {}
 
   bool match() {
     if (!ends_with_tail()) return false;
+    if (tail_ == pattern_) return pattern_end_ - pattern_ == text_end_ - text_;
     if (match_run() != Outcome::matched) return false;
     while (*pattern_ == '*') {
       while (*pattern_ == '*') ++pattern_;
@@ -130,16 +160,12 @@ class Matcher {
   }
 
   Outcome match_set() {
-    const bool negated = pattern_[1] == '^';
-    const char* const members = pattern_ + (negated ? 2 : 1);
-    // The first member may be the bracket itself.
-    const char* const close = *members != '\0' ? std::strchr(members + 1, ']') : nullptr;
-    if (close == nullptr) return Outcome::given_up;
+    const Set set(pattern_);
+    if (!set.closed()) return Outcome::given_up;
     const Character character = decode(text_);
     text_ += character.length;
-    pattern_ = close + 1;
-    return holds({members, close}, character.value) != negated ? Outcome::matched
-                                                               : Outcome::differs;
+    pattern_ = set.end();
+    return set.takes(character.value) ? Outcome::matched : Outcome::differs;
   }
 
   // Finds the first place from here on where the run behind a star matches; the last run must also
@@ -147,7 +173,7 @@ class Matcher {
   bool match_behind_star() {
     const char* const run = pattern_;
     const char* start = text_;
-    while ((start = next_start(start, *run)) != nullptr) {
+    while ((start = next_start(start, run)) != nullptr) {
       text_ = start;
       pattern_ = run;
       const Outcome outcome = match_run();
@@ -158,14 +184,24 @@ class Matcher {
     return false;
   }
 
-  // The next character that a run with this first element may start at; nullptr when none is left.
-  const char* next_start(const char* text, char element) const {
+  // The next place from `text` on where the beginning of a run matches; nullptr when there is none.
+  const char* next_start(const char* text, const char* run) const {
     if (text == text_end_) return nullptr;
-    if (element == '[' || element == '?' || element == '\\') return text;
+    if (*run == '?' || *run == '\\') return text;
+    if (*run == '[') return next_in_set(text, Set(run));
     // Any other byte than a continuation can only be the first of a character.
-    if (!is_continuation(element)) return std::strchr(text, element);
-    while (text != text_end_ && *text != element) text += decode(text).length;
+    if (!is_continuation(*run)) return zv::find({text, text_end_}, literal_head(run));
+    while (text != text_end_ && *text != *run) text += decode(text).length;
     return text != text_end_ ? text : nullptr;
+  }
+
+  const char* next_in_set(const char* text, const Set& set) const {
+    while (set.closed() && text != text_end_) {
+      const Character character = decode(text);
+      if (set.takes(character.value)) return text;
+      text += character.length;
+    }
+    return nullptr;
   }
 
   const char* text_;

@@ -4,37 +4,24 @@
 // none, and one for which memory ran out is searched entry by entry, with the same result.
 #include <algorithm>
 #include <bit>
-#include <cctype>
 #include <cstdlib>
 #include <cstring>
 
 #include "frame/owner.h"
+#include "platform/platform.h"
 #include "zarvo.h"
 
 namespace {
 
-struct Equality {
-  size_t (*hash)(const char*);
-  int (*compare)(const char*, const char*);
-};
+using Compare = int (*)(const char*, const char*);
 
-template <class Fold>
-size_t fnv1a(const char* s, Fold fold) {
+// FNV-1a of the text's bytes, as `map` has them.
+template <class Map>
+size_t hash_of(const char* s, Map map) {
   uint64_t hash = 0xcbf29ce484222325;
-  for (; *s != '\0'; ++s) hash = (hash ^ fold(static_cast<unsigned char>(*s))) * 0x100000001b3;
+  for (; *s != '\0'; ++s) hash = (hash ^ map(static_cast<uint8_t>(*s))) * 0x100000001b3;
   return static_cast<size_t>(hash);
 }
-
-size_t hash_exact(const char* s) {
-  return fnv1a(s, [](unsigned char ch) { return ch; });
-}
-
-size_t hash_without_case(const char* s) {
-  return fnv1a(s, [](unsigned char ch) { return static_cast<unsigned char>(std::tolower(ch)); });
-}
-
-constexpr Equality exact{hash_exact, std::strcmp};
-constexpr Equality without_case{hash_without_case, zv_stricmp};
 
 // The texts seen so far, in an open hash table that is never more than two thirds full.
 class Index {
@@ -47,11 +34,10 @@ class Index {
   bool usable() const { return slots_ != nullptr; }
 
   // Whether an equal text was seen before; if not, this one has been from now on.
-  bool seen(const char* text, const Equality& equality) {
-    const size_t hash = equality.hash(text);
+  bool seen(const char* text, size_t hash, Compare compare) {
     size_t i = hash & mask_;
     for (; slots_[i].text != nullptr; i = (i + 1) & mask_)
-      if (slots_[i].hash == hash && equality.compare(slots_[i].text, text) == 0) return true;
+      if (slots_[i].hash == hash && compare(slots_[i].text, text) == 0) return true;
     slots_[i] = {text, hash};
     return false;
   }
@@ -82,26 +68,32 @@ int keep_unseen(char** list, int count, Seen seen) {
   return count - kept;
 }
 
-int remove_duplicates(char** list, int n, const Equality& equality) {
+template <class Map>
+int remove_duplicates(char** list, int n, Compare compare, Map map) {
   constexpr int worth_an_index = 16;
   const int count = n < 0 ? zv_strlist_len(list) : n;
   if (count >= worth_an_index) {
     Index index(static_cast<size_t>(count));
-    const auto indexed = [&](const char* text, int) { return index.seen(text, equality); };
+    const auto indexed = [&](const char* text, int) {
+      return index.seen(text, hash_of(text, map), compare);
+    };
     if (index.usable()) return keep_unseen(list, count, indexed);
   }
   return keep_unseen(list, count, [&](const char* text, int kept) {
-    return std::any_of(list, list + kept,
-                       [&](const char* other) { return equality.compare(other, text) == 0; });
+    const auto equals = [&](const char* other) { return compare(other, text) == 0; };
+    return std::any_of(list, list + kept, equals);
   });
 }
 
 }  // namespace
 
 int zv_strlist_set(char** list, int n) {
-  return remove_duplicates(list, n, exact);
+  return remove_duplicates(list, n, std::strcmp, [](uint8_t byte) { return uint64_t{byte}; });
 }
 
 int zv_strlist_iset(char** list, int n) {
-  return remove_duplicates(list, n, without_case);
+  zv::platform::ByteMap room;
+  const int32_t* const lower = zv::platform::lower_map(room);
+  return remove_duplicates(list, n, zv_stricmp,
+                           [lower](uint8_t byte) { return static_cast<uint64_t>(lower[byte]); });
 }

@@ -1,0 +1,175 @@
+// Search for a text within another.
+//
+// A place is worth a closer look where the bytes under the needle's first and last one both fit.
+// That much is tested for a whole block of places at once, in vectors that the compiler maps to
+// what the machine has.
+#include "strings/search.h"
+
+#include <array>
+#include <bit>
+#include <cstring>
+
+namespace zv {
+
+namespace {
+
+using Block = uint8_t __attribute__((vector_size(16)));
+using Words = uint64_t __attribute__((vector_size(16)));
+
+constexpr size_t block_size = sizeof(Block);
+
+uint8_t byte_of(char ch) {
+  return static_cast<uint8_t>(ch);
+}
+
+Block filled(int byte) {
+  return Block{} + static_cast<uint8_t>(byte);
+}
+
+Block load(const char* text) {
+  Block bytes;
+  std::memcpy(&bytes, text, sizeof bytes);
+  return bytes;
+}
+
+// Both filters set the highest bit of each byte that may equal a given one.
+class ExactFilter {
+ public:
+  explicit ExactFilter(char ch) : value_(filled(byte_of(ch))) {}
+  Block operator()(Block bytes) const { return reinterpret_cast<Block>(bytes == value_); }
+
+ private:
+  Block value_;
+};
+
+// Lets through both forms of an ASCII letter, and every byte above ASCII: only the locale knows
+// about those. Where the locale has a case of its own for ASCII, it lets every byte through.
+class CaselessFilter {
+ public:
+  CaselessFilter(char ch, bool ascii_case) {
+    const int byte = byte_of(ch);
+    const bool letter = (byte | 0x20) >= 'a' && (byte | 0x20) <= 'z';
+    value_ = filled(!ascii_case ? 0xFF : letter ? byte | 0x20 : byte);
+    ignored_ = filled(!ascii_case ? 0xFF : letter ? 0x20 : 0);
+  }
+  Block operator()(Block bytes) const {
+    return reinterpret_cast<Block>((bytes | ignored_) == value_) | bytes;
+  }
+
+ private:
+  Block value_;
+  Block ignored_;  // bits that do not count
+};
+
+// The first place of a block where `equals(place)` holds, of those whose highest bit is set.
+template <class Equals>
+const char* first_equal(const char* block, Block places, Equals equals) {
+  const Words words = reinterpret_cast<Words>(places) & 0x8080808080808080;
+  for (size_t i = 0; i < 2; ++i) {
+    uint64_t word = words[i];
+    if constexpr (std::endian::native == std::endian::big) word = __builtin_bswap64(word);
+    for (; word != 0; word &= word - 1) {
+      const char* const place = block + 8 * i + std::countr_zero(word) / 8;
+      if (equals(place)) return place;
+    }
+  }
+  return nullptr;
+}
+
+bool any(Block places) {
+  const Words words = reinterpret_cast<Words>(places) & 0x8080808080808080;
+  return (words[0] | words[1]) != 0;
+}
+
+// The first place in the text where `equals(place)` holds; it is asked of few other places.
+template <class MakeFilter, class Equals>
+const char* search(std::string_view text, std::string_view needle, MakeFilter filter,
+                   Equals equals) {
+  constexpr size_t group = 4;
+  const size_t length = needle.size();
+  const auto first = filter(0);
+  const auto middle = filter(length / 2);
+  const auto last = filter(length - 1);
+  const auto promising = [&](const char* place) {
+    return first(load(place)) & middle(load(place + length / 2)) & last(load(place + length - 1));
+  };
+  const char* place = text.data();
+  const char* const end = place + (text.size() - length + 1);
+  while (static_cast<size_t>(end - place) >= group * block_size) {
+    Block places[group];
+    for (size_t i = 0; i < group; ++i) places[i] = promising(place + i * block_size);
+    if (any(places[0] | places[1] | places[2] | places[3])) {
+      for (size_t i = 0; i < group; ++i) {
+        const char* const found = first_equal(place + i * block_size, places[i], equals);
+        if (found != nullptr) return found;
+      }
+    }
+    place += group * block_size;
+  }
+  for (; place != end; place += block_size) {
+    // The last block overlaps the one before.
+    if (static_cast<size_t>(end - place) < block_size) place = end - block_size;
+    const char* const found = first_equal(place, promising(place), equals);
+    if (found != nullptr) return found;
+  }
+  return nullptr;
+}
+
+template <class Equals>
+const char* search_each(std::string_view text, size_t length, Equals equals) {
+  const char* place = text.data();
+  const char* const end = place + (text.size() - length + 1);
+  while (place != end && !equals(place)) ++place;
+  return place != end ? place : nullptr;
+}
+
+constexpr std::array<int32_t, 128> ascii_lower = [] {
+  std::array<int32_t, 128> map{};
+  for (int32_t byte = 0; byte < 128; ++byte)
+    map[static_cast<size_t>(byte)] = byte >= 'A' && byte <= 'Z' ? byte + 0x20 : byte;
+  return map;
+}();
+
+// Some locales have case of their own even for ASCII.
+bool has_ascii_case(const int32_t* lower) {
+  return std::memcmp(lower, ascii_lower.data(), sizeof ascii_lower) == 0;
+}
+
+}  // namespace
+
+// Whether the places that the needle may be found at fill a block.
+bool fill_a_block(std::string_view text, std::string_view needle) {
+  return text.size() >= needle.size() + block_size - 1;
+}
+
+const char* find(std::string_view text, std::string_view needle) {
+  if (needle.size() > text.size()) return nullptr;
+  const auto equals = [needle](const char* place) {
+    return *place == needle.front() && std::memcmp(place, needle.data(), needle.size()) == 0;
+  };
+  if (!fill_a_block(text, needle)) return search_each(text, needle.size(), equals);
+  if (needle.size() == 1)
+    return static_cast<const char*>(std::memchr(text.data(), needle.front(), text.size()));
+  const auto filter = [needle](size_t i) { return ExactFilter(needle[i]); };
+  return search(text, needle, filter, equals);
+}
+
+const char* find_without_case(std::string_view text, std::string_view needle,
+                              const int32_t* lower) {
+  if (needle.size() > text.size()) return nullptr;
+  const int32_t first = lower[byte_of(needle.front())];
+  const auto equals = [=](const char* place) {
+    if (lower[byte_of(*place)] != first) return false;
+    for (size_t i = 1; i < needle.size(); ++i)
+      if (lower[byte_of(place[i])] != lower[byte_of(needle[i])]) return false;
+    return true;
+  };
+  if (!fill_a_block(text, needle)) return search_each(text, needle.size(), equals);
+  const bool ascii_case = has_ascii_case(lower);
+  const auto filter = [needle, ascii_case](size_t i) {
+    return CaselessFilter(needle[i], ascii_case);
+  };
+  return search(text, needle, filter, equals);
+}
+
+}  // namespace zv

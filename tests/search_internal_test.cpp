@@ -1,0 +1,77 @@
+// The block search, exact and without regard to case, against its definition.
+#include "strings/search.h"
+
+#include <gtest/gtest.h>
+
+#include <array>
+#include <memory>
+#include <random>
+#include <string>
+
+namespace {
+
+using Map = std::array<int32_t, 256>;
+
+Map map_with(std::initializer_list<std::pair<int, int>> changes) {
+  Map map;
+  for (int byte = 0; byte < 256; ++byte) map[static_cast<size_t>(byte)] = byte;
+  for (int byte = 'A'; byte <= 'Z'; ++byte) map[static_cast<size_t>(byte)] = byte + 0x20;
+  for (const auto& [from, to] : changes) map[static_cast<size_t>(from)] = to;
+  return map;
+}
+
+// Case as different locales have it: none above ASCII, some there, and ASCII letters of their own.
+const Map maps[] = {
+    map_with({}),
+    map_with({{0xC9, 0xE9}, {0xC0, 0xE0}}),
+    map_with({{'I', 0xFD}, {0xDD, 'i'}}),
+    map_with({{'@', '`'}, {'[', 'a'}}),
+};
+
+class Generator {
+ public:
+  std::string text(size_t length) {
+    constexpr char bytes[] = "aAbBiI[{@`\xC9\xE9\xDD\xFD";
+    // Few different bytes make near misses.
+    const size_t kinds = 2 + below(sizeof bytes - 2);
+    std::string made;
+    while (made.size() < length) made += bytes[below(kinds)];
+    return made;
+  }
+
+  size_t below(size_t limit) { return random_() % limit; }
+
+ private:
+  std::mt19937 random_{11};
+};
+
+TEST(Search, AgreesWithItsDefinition) {
+  Generator generate;
+  int found = 0;
+  constexpr int cases = 40000;
+  for (int i = 0; i < cases; ++i) {
+    const std::string text = generate.text(generate.below(i % 2 == 0 ? 40 : 200));
+    const std::string needle = generate.text(1 + generate.below(i % 3 == 0 ? 30 : 5));
+    const Map& lower = maps[generate.below(std::size(maps))];
+    const auto folded = [&](std::string s) {
+      for (char& ch : s) ch = static_cast<char>(lower[static_cast<unsigned char>(ch)]);
+      return s;
+    };
+    // Exactly its bytes, so that a sanitizer sees a step beyond them.
+    const std::unique_ptr<char[]> bytes(new char[text.size()]);
+    text.copy(bytes.get(), text.size());
+    const std::string_view view(bytes.get(), text.size());
+    const auto position = [&](const char* place) {
+      return place != nullptr ? static_cast<size_t>(place - bytes.get()) : std::string::npos;
+    };
+    const size_t expected = folded(text).find(folded(needle));
+    ASSERT_EQ(position(zv::find(view, needle)), text.find(needle)) << text << " " << needle;
+    ASSERT_EQ(position(zv::find_without_case(view, needle, lower.data())), expected)
+        << text << " " << needle;
+    found += expected != std::string::npos ? 1 : 0;
+  }
+  EXPECT_GT(found, cases / 10);
+  EXPECT_LT(found, cases * 9 / 10);
+}
+
+}  // namespace
