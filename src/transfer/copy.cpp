@@ -4,6 +4,7 @@
 #include "transfer/local.h"
 #include "transfer/location.h"
 #include "transfer/result.h"
+#include "transfer/smtp.h"
 
 namespace {
 
@@ -32,6 +33,9 @@ int upload(const char* local, const location_t& destination) {
       return zv::ftp_upload(destination.addr, destination.port, user, password, local, path);
     case zv::LOC_HTTP:
       return zv::http_put(destination.addr, destination.port, user, password, local, path);
+    case zv::LOC_SMTP:  // the recipient is the path without its leading slash
+      return zv::smtp_send_file(destination.addr, destination.port, user, password, local,
+                                path + 1);
     default:
       return zv::destination_failed;
   }
