@@ -1901,10 +1901,13 @@ char* zv_fmt_force(const char* entry, char* name);
  * response must announce its length, and that must not be 0. A user is sent as Basic credentials.
  * - A mail (RFC 5321, RFC 2045) carries the file as an attachment under its own name. It comes from
  *   the location's user when that holds an `@`, else from the local user. A user asks for a login.
+ *   Addresses and the file's name stand in the mail as they are: no angle brackets are added and
+ *   nothing is quoted or encoded. A recipient with a space or a comma, or a name with a `"` or with
+ *   bytes beyond ASCII, is for the server and the reader to judge.
  * - Between two network locations the file goes through a private folder in the temporary folder,
- *   which is removed.
+ *   which is removed. The source's file name must be one that a local file can have, without `\`.
  * - No text adds a command or a header line: CR or LF in the user, password or decoded path of a
- *   network location makes it unusable.
+ *   network location makes it unusable, and a file with one in its name is not mailed.
  *
  * @param from the source: at most 318 characters behind the scheme; not `smtp://`. NULL or "" is a
  *             failure of its side.

@@ -8,6 +8,7 @@
 #include <cstdint>
 #include <cstdio>
 #include <ctime>
+#include <string_view>
 
 #include "frame/text_buffer.h"
 #include "zarvo.h"
@@ -64,6 +65,16 @@ bool local_time(struct tm& out, int& offset_minutes);
 // ---- processor.cpp: what the machine can do -----------------------------------------------------
 
 bool has_wide_vectors();  // AVX2
+
+// ---- temporary.cpp: a folder of one's own for a short time --------------------------------------
+
+// Makes a folder that nobody else may enter, of a new name inside the folder `path`, which ends in
+// a separator; appends the name to it.
+bool make_private_folder(PathBuffer& path);
+
+// Whether a plain path may end in the name and mean an ordinary file of that folder: no separator
+// in either style, no device, no stream of another file.
+bool names_a_file(std::string_view name);
 
 // ---- stream.cpp: what C streams leave out -------------------------------------------------------
 
@@ -122,7 +133,7 @@ enum class Removal { removed, gone, failed };
 // Removes an entry itself, a folder only when it is empty. `path` is its full path, for a platform
 // that has no calls relative to a folder.
 Removal remove_below(intptr_t folder, const char* name, const char* path);
-bool remove_folder(const char* path);
+bool remove_folder(const char* path);  // an empty one
 
 // ---- library.cpp: dynamic libraries -------------------------------------------------------------
 

@@ -3,6 +3,7 @@
 #include "transfer/http.h"
 #include "transfer/local.h"
 #include "transfer/location.h"
+#include "transfer/relay.h"
 #include "transfer/result.h"
 #include "transfer/smtp.h"
 
@@ -59,5 +60,5 @@ int zv_copy(const char* from, const char* to) {
   if (from_local && to_local) return zv::copy_local(source_path, destination_path);
   if (from_local) return upload(source_path, destination);
   if (to_local) return download(source, destination_path);
-  return zv::source_failed;
+  return zv::copy_through_temporary(from, source_path, to);
 }
