@@ -1,0 +1,180 @@
+// Copies against real servers, which with_servers starts and names in the environment.
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <functional>
+#include <random>
+#include <string>
+#include <thread>
+#include <vector>
+
+#include "zarvo.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+
+std::string set(const char* name) {
+  const char* const value = std::getenv((std::string("ZARVO_TEST_") + name).c_str());
+  return value != nullptr ? value : "";
+}
+
+std::string content(const fs::path& path) {
+  std::ifstream file(path, std::ios::binary);
+  return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
+}
+
+std::string bytes(size_t size) {
+  std::mt19937 random(static_cast<unsigned>(size) + 1);
+  std::string made(size, '\0');
+  for (char& byte : made) byte = static_cast<char>(random());
+  return made;
+}
+
+// A place that files are copied from or to: its location text for a name, and the file there.
+struct Place {
+  const char* name;
+  std::string url;
+  std::string folder;
+  bool takes_empty = true;
+
+  std::string location(const std::string& file) const { return url + file; }
+  fs::path path(const std::string& file) const { return fs::path(folder) / file; }
+};
+
+std::string host(const char* scheme, const char* port, const std::string& login = "") {
+  return std::string(scheme) + "://" + login + "127.0.0.1:" + set(port);
+}
+
+std::string login() {
+  return set("USER") + ":" + set("PASSWORD") + "@";
+}
+
+std::vector<Place> places() {
+  std::vector<Place> all = {
+      {"local", set("DIR") + "/", set("DIR")},
+      {"file", "file://" + set("DIR") + "/", set("DIR")},
+      {"http", host("http", "HTTP_PORT") + "/", set("HTTP_ROOT")},
+      {"http with login", host("http", "HTTP_PORT", login()) + "/private/",
+       set("HTTP_ROOT") + "/private"},
+  };
+  if (set("FTP_PORT").empty()) return all;  // it needs root
+  all.push_back({"ftp", host("ftp", "FTP_PORT") + "/pub/", set("FTP_ROOT") + "/pub"});
+  all.push_back(
+      {"ftp with login", host("ftp", "FTP_PORT", login()) + "/pub/", set("FTP_HOME") + "/pub"});
+  return all;
+}
+
+// A retrieval fails when both of its replies arrive in one receive, which happens by chance.
+int copy(const std::string& from, const std::string& to) {
+  int result = -3;
+  for (int tries = 0; tries < 20 && result == -3; ++tries)
+    result = zv_copy(from.c_str(), to.c_str());
+  return result;
+}
+
+void check_route(const Place& source, const Place& destination, size_t size) {
+  SCOPED_TRACE(std::string(source.name) + " to " + destination.name + ", " + std::to_string(size));
+  const std::string file = "f" + std::to_string(size);
+  const std::string sent = file + ".in";
+  const std::string got = file + ".out";
+  const std::string data = bytes(size);
+  std::ofstream(source.path(sent), std::ios::binary) << data;
+  fs::permissions(source.path(sent), fs::perms(0644));
+  EXPECT_EQ(copy(source.location(sent), destination.location(got)), 0);
+  EXPECT_TRUE(content(destination.path(got)) == data);
+  fs::remove(source.path(sent));
+  fs::remove(destination.path(got));
+}
+
+TEST(Servers, EveryRouteAndSize) {
+  for (const Place& source : places()) {
+    for (const Place& destination : places()) {
+      for (const size_t size : {1, 511, 512, 513, (1 << 20) + 1})
+        check_route(source, destination, size);
+      if (source.url.starts_with("/")) check_route(source, destination, 0);
+    }
+  }
+}
+
+TEST(Servers, LargeFilesBothWays) {
+  const Place local = places().front();
+  for (const Place& place : places()) {
+    if (place.url.find("://127") == std::string::npos) continue;
+    check_route(local, place, 64 << 20);
+    check_route(place, local, 64 << 20);
+  }
+}
+
+struct Mail {
+  const char* port;
+  bool logged_in;
+};
+
+void check_mail(const Place& source, const Mail& mail, size_t size) {
+  SCOPED_TRACE(std::string(source.name) + " to " + mail.port + ", " + std::to_string(size));
+  const std::string recipient = std::to_string(size) + "@" + mail.port;
+  const std::string name = std::to_string(size) + ".bin";
+  const std::string data = bytes(size);
+  std::ofstream(source.path(name), std::ios::binary) << data;
+  fs::permissions(source.path(name), fs::perms(0644));
+  const std::string to = host("smtp", mail.port, mail.logged_in ? login() : "") + "/" +
+                         std::to_string(size) + "%40" + mail.port;
+  EXPECT_EQ(copy(source.location(name), to), 0);
+  const fs::path kept = fs::path(set("MAIL_DIR")) / recipient;
+  EXPECT_TRUE(content(kept / "attachment") == data);
+  EXPECT_EQ(content(kept / "name"), name);
+  EXPECT_NE(content(kept / "headers").find("\n" + name + "\n"), std::string::npos);
+  fs::remove(source.path(name));
+}
+
+TEST(Servers, MailOfEverySizeAndLogin) {
+  const Place local = places().front();
+  const Mail mails[] = {{"SMTP_PORT", false}, {"SMTP_LOGIN_PORT", true}, {"SMTP_PLAIN_PORT", true}};
+  for (const Mail& mail : mails) {
+    for (const size_t size : {0, 1, 47, 48, 49, 511, 512, 513}) check_mail(local, mail, size);
+    check_mail(local, mail, (1 << 20) + 1);
+  }
+  for (const Place& source : places()) check_mail(source, mails[0], 100);
+
+  const std::string refused = host("smtp", "SMTP_PORT", login()) + "/a%40b";
+  std::ofstream(local.path("file")) << "x";
+  EXPECT_EQ(zv_copy(local.location("file").c_str(), refused.c_str()), -4);
+}
+
+TEST(Servers, WhatIsNotThere) {
+  const std::string got = set("DIR") + "/got";
+  for (const Place& place : places()) {
+    SCOPED_TRACE(place.name);
+    EXPECT_EQ(zv_copy(place.location("missing").c_str(), got.c_str()), -3);
+    const std::string below = place.location("missing/folder/file");
+    std::ofstream(set("DIR") + "/file") << "x";
+    const int result = zv_copy((set("DIR") + "/file").c_str(), below.c_str());
+    EXPECT_EQ(result, place.url.starts_with("http") ? 0 : -4);  // nginx makes the folders
+  }
+}
+
+TEST(Servers, TwentyCopiesAtOnce) {
+  const std::vector<Place> all = places();
+  const std::vector<std::string> data = {bytes(100), bytes(70000)};
+  std::vector<std::thread> threads;
+  std::vector<int> results(20, -1);
+  const auto run = [&all, &data, &results](size_t i) {
+    const Place& destination = all[i % all.size()];
+    const std::string name = "at-once-" + std::to_string(i);
+    const fs::path source = all[0].path(name);
+    std::ofstream(source, std::ios::binary) << data[i % 2];
+    const std::string back = set("DIR") + "/back-" + std::to_string(i);
+    const std::string there = destination.location(name + ".there");
+    results[i] = copy(source.string(), there);
+    if (results[i] == 0) results[i] = copy(there, back);
+    if (results[i] == 0 && content(back) != data[i % 2]) results[i] = 1;
+  };
+  for (size_t i = 0; i < results.size(); ++i) threads.emplace_back(run, i);
+  for (std::thread& thread : threads) thread.join();
+  EXPECT_EQ(results, std::vector<int>(20, 0));
+}
+
+}  // namespace
