@@ -26,12 +26,9 @@ size_t idle_size(const char* text) {
   size_t size = 0;
   for (;;) {
     const char* const rest = text + size;
-    if (rest[0] == '/')
-      ++size;
-    else if (rest[0] == '.' && (rest[1] == '/' || rest[1] == '\0'))
-      ++size;
-    else
-      return size;
+    const bool component = rest[0] == '.' && (rest[1] == '/' || rest[1] == '\0');
+    if (rest[0] != '/' && !component) return size;
+    ++size;
   }
 }
 
