@@ -82,7 +82,11 @@ class Tool(unittest.TestCase):
             (["path", "relative", "/a/b/f.txt", "--base", "/a/c"], 0, "../b/f.txt\n"),
             (["path", "relative", "D:/a", "--base", "D:/A"], 0, ".\n"),
             (["path", "split", "//srv/share/a/b"], 0, "//srv/share/\na\nb\n"),
+            (["path", "locate", "no-such-program"], 1, ""),
         ])
+        path = {"WINEPATH" if emulator else "PATH": seen_by_tool(work / "tree")}
+        self.assertEqual(self.zv("path", "locate", "b.txt", **path)[:2],
+                         (0, seen_by_tool(work / "tree/b.txt").replace("\\", "/") + "\n"))
         code, _, message = self.zv("path", "split", "x" * 320)
         self.assertEqual(code, 1)
         self.assertIn("319", message)

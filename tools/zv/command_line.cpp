@@ -111,6 +111,8 @@ void add_path(Program& program) {
   add("relative", "Say how a path is reached from a base; both are absolute", path_relative)
       .takes("--base", &PathOptions::base, "FOLDER", base_help);
   add("split", "Print a path's root and each component", path_split);
+  add("locate", "Find a file in the folders of PATH", path_locate)
+      .note("The exit code is 1 when none of them has it.");
 }
 
 void add_remove(Program& program) {

@@ -42,6 +42,7 @@ int path_normalize(const PathOptions& options);
 int path_absolute(const PathOptions& options);
 int path_relative(const PathOptions& options);
 int path_split(const PathOptions& options);
+int path_locate(const PathOptions& options);
 
 struct RemoveOptions {
   std::string folder;

@@ -57,4 +57,11 @@ int path_split(const PathOptions& options) {
   return done;
 }
 
+int path_locate(const PathOptions& options) {
+  PathText path;
+  if (!path.assign(options.path) || zv_path_locate(path.data()) == 0) return no;
+  std::puts(path.c_str());
+  return done;
+}
+
 }  // namespace tool
