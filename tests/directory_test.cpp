@@ -241,6 +241,26 @@ TEST(DirectoryScan, LinksAreEntriesAndAreNotFollowed) {
   EXPECT_EQ(zv_dir_select(top.c_str(), "dangling", &folders), 0);
 }
 
+int swap_for_a_link(const char* dir, const char* name, void* outside) {
+  const std::string path = std::string(dir) + "/" + name;
+  if (std::string(name) == "folder") {
+    std::filesystem::rename(path, path + "-moved");
+    std::filesystem::create_symlink(static_cast<const char*>(outside), path);
+  }
+  return 1;
+}
+
+TEST(DirectoryScan, AFolderSwappedForALinkIsNotEntered) {
+  const ScratchFolder scratch;
+  scratch.make_file("outside/secret");
+  scratch.make_file("top/sub/folder/inner");
+  const std::string top = scratch.path("top");
+  const std::string outside = scratch.path("outside");
+  const Names found = scan(top, swap_for_a_link, const_cast<char*>(outside.c_str()), 1, 1).names;
+  EXPECT_EQ(std::count(found.begin(), found.end(), top + "/sub/folder"), 1);
+  EXPECT_EQ(std::count(found.begin(), found.end(), top + "/sub/folder/secret"), 0);
+}
+
 TEST(DirectoryScan, NamesWithABackslashAreTakenAsTheyAre) {
   const ScratchFolder scratch;
   scratch.make_file("top/a\\b/inner");

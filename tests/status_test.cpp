@@ -8,6 +8,10 @@
 #include "wine.h"
 #include "zarvo.h"
 
+#ifndef _WIN32
+#include <sys/xattr.h>
+#endif
+
 namespace {
 
 int kind_of(const std::string& path) {
@@ -77,5 +81,52 @@ TEST(Status, ADotIsNoAttribute) {
   const ScratchFolder scratch;
   EXPECT_EQ(zv_get_hidden(scratch.make_file(".dotted").c_str()), 0);
 }
+
+#ifndef _WIN32
+// The attribute as others write it: their bits stay, and so does what is not plain hex text.
+TEST(Status, HiddenAmongOtherAttributes) {
+  struct Case {
+    std::string before;
+    int hidden, can_set;
+    const char *set, *cleared;  // the value after each; nullptr where none is left
+  };
+  const std::string stranger("0x2\0more", 8);
+  const Case cases[] = {
+      {"0x2", 1, 1, "0x2", nullptr},
+      {"0x22", 1, 1, "0x22", "0x20"},
+      {"0x20", 0, 1, "0x22", "0x20"},
+      {"0xFD", 0, 1, "0xff", "0xfd"},
+      {"hidden", 0, 0, "hidden", "hidden"},
+      {"2", 0, 0, "2", "2"},
+      {"0x", 0, 0, "0x", "0x"},
+      {"0x2g", 0, 0, "0x2g", "0x2g"},
+  };
+  const ScratchFolder scratch;
+  const std::string file = scratch.make_file("file");
+  if (zv_set_hidden(file.c_str(), 1) == 0) GTEST_SKIP() << "no attributes on this file system";
+  const char* const name = "user.DOSATTRIB";
+  const auto put = [&](const std::string& value) {
+    ASSERT_EQ(setxattr(file.c_str(), name, value.data(), value.size(), 0), 0);
+  };
+  const auto value = [&] {
+    char room[32] = "";
+    const ssize_t size = getxattr(file.c_str(), name, room, sizeof room);
+    return size < 0 ? std::string("none") : std::string(room, static_cast<size_t>(size));
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.before);
+    put(c.before);
+    EXPECT_EQ(zv_get_hidden(file.c_str()), c.hidden);
+    EXPECT_EQ(zv_set_hidden(file.c_str(), 1), c.can_set);
+    EXPECT_EQ(value(), c.hidden ? c.before : c.set);
+    EXPECT_EQ(zv_set_hidden(file.c_str(), 0), 1);
+    EXPECT_EQ(value(), c.cleared != nullptr ? c.cleared : "none");
+  }
+  put(stranger);
+  EXPECT_EQ(zv_get_hidden(file.c_str()), 0);
+  EXPECT_EQ(zv_set_hidden(file.c_str(), 1), 0);
+  EXPECT_EQ(value(), stranger);
+}
+#endif
 
 }  // namespace

@@ -36,8 +36,10 @@ bool make_folder(const char* path) {
 
 bool make_folders(const zv::Components& pieces) {
   zv::JoinedPath prefix;
-  // What exists tells that everything in front of it does, so the search for it starts at the end.
-  size_t made = pieces.size();
+  // What exists tells that everything in front of it does, so the search for it starts at the end;
+  // but a platform that reads ".." in the text alone tells nothing about what stands before that.
+  size_t made = 0;
+  while (made < pieces.size() && pieces[made] != "..") ++made;
   for (; made > 0; --made) {
     if (!join_first(pieces, made, prefix)) return false;
     if (exists(prefix.c_str())) break;

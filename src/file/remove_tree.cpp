@@ -15,9 +15,10 @@ namespace {
 // The open folders on the way from the top of a tree to the entry at hand.
 class FolderChain {
  public:
-  explicit FolderChain(const zv::PathBuffer& top) : path_(top) {
+  explicit FolderChain(const zv::PathBuffer& top) {
     const intptr_t folder = platform::folder_open(top.c_str());
-    if (folder != platform::no_folder && (path_.back() == '/' || path_.append('/'))) push(folder);
+    if (folder == platform::no_folder || !path_.append(top.view())) return;
+    if (path_.back() == '/' || path_.append('/')) push(folder);
   }
   ~FolderChain() {
     while (open()) pop();
@@ -74,7 +75,8 @@ class FolderChain {
 
   size_t depth_ = 0;
   Level levels_[ZV_PATH_MAX / 2];  // a name and a separator each
-  zv::PathBuffer path_;            // of the innermost folder
+  // Of the innermost folder, and the separator for which the longest path leaves no room.
+  zv::TextBuffer<ZV_PATH_MAX + 1> path_;
 };
 
 bool remove_content(const zv::PathBuffer& top) {

@@ -9,7 +9,8 @@ namespace zv::platform {
 
 namespace {
 
-constexpr int folder_flags = O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC;
+// A place to remove from, which takes no right to read it.
+constexpr int folder_flags = O_PATH | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC;
 
 int descriptor_of(intptr_t folder) {
   return static_cast<int>(folder);
@@ -32,9 +33,8 @@ void folder_close(intptr_t folder) {
 Removal remove_below(intptr_t folder, const char* name, const char*) {
   const int descriptor = descriptor_of(folder);
   if (::unlinkat(descriptor, name, 0) == 0) return Removal::removed;
-  // Linux tells a folder by EISDIR, POSIX by EPERM.
-  const bool may_be_folder = errno == EISDIR || errno == EPERM;
-  if (may_be_folder && ::unlinkat(descriptor, name, AT_REMOVEDIR) == 0) return Removal::removed;
+  const bool is_folder = errno == EISDIR;
+  if (is_folder && ::unlinkat(descriptor, name, AT_REMOVEDIR) == 0) return Removal::removed;
   return errno == ENOENT ? Removal::gone : Removal::failed;
 }
 
