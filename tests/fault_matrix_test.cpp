@@ -126,7 +126,8 @@ int copy_against(const Dialogue& dialogue, Fault fault, size_t step, const Scrat
   const auto begin = std::chrono::steady_clock::now();
   const int result = dialogue.download ? zv_copy(remote.c_str(), local.c_str())
                                        : zv_copy(local.c_str(), remote.c_str());
-  EXPECT_LT(std::chrono::steady_clock::now() - begin, std::chrono::seconds(1));
+  // Far from a hang, even on a busy machine under Wine.
+  EXPECT_LT(std::chrono::steady_clock::now() - begin, std::chrono::seconds(20));
   const std::string stored = server.stored();
   if (result == 0 && dialogue.download) {
     EXPECT_EQ(folder.content("got"), "hello");
