@@ -18,8 +18,7 @@ install(FILES
   ${PROJECT_BINARY_DIR}/zarvoConfig.cmake
   ${PROJECT_BINARY_DIR}/zarvoConfigVersion.cmake
   DESTINATION ${package_dir} COMPONENT development)
-install(FILES cmake/zarvo_add_plugin.cmake DESTINATION ${package_dir} COMPONENT development
-        OPTIONAL)
+install(FILES cmake/zarvo_add_plugin.cmake DESTINATION ${package_dir} COMPONENT development)
 
 # What the static library needs is private to the shared one, and of concern to all where there is
 # no shared one.

@@ -1805,48 +1805,445 @@ ZV_API int zv_rmpath(const char* path);
  * Dynamic libraries and plugins
  */
 
-void* zv_dll_open(const char* path, int has_ext);
-void* zv_dll_getptr(void* lib, const char* name, const char* fmt);
-void* zv_dll_close(void* lib);
+/**
+ * @defgroup dll Dynamic libraries
+ * Open a library, find a symbol in it and close it, the same way on both platforms.
+ *
+ * A path may be written in either separator style, and the extension that is added is ".dll" on
+ * every platform. A library is code: opening it runs its start-up with the caller's rights.
+ *
+ * @code
+ *   void* lib = zv_dll_open("codecs/fast", 0);                     // codecs/fast.dll
+ *   codec_t* codec = (codec_t*)zv_dll_getptr(lib, "codec", "%s_v2");  // codec_v2
+ *   ...
+ *   lib = zv_dll_close(lib);
+ * @endcode
+ * @{
+ */
+
+/**
+ * Open a dynamic library.
+ *
+ * A path without a directory is looked for where the platform looks; on Windows, a library with an
+ * absolute path finds the libraries that lie beside it. Each open needs its own zv_dll_close(). On
+ * Linux the library's symbols are all bound at once and stay its own (`RTLD_NOW | RTLD_LOCAL`), and
+ * a path that leads to a pipe, or to a library whose end is missing, is refused rather than tried.
+ *
+ * @param path    the library's path; with its extension it has at most 319 characters.
+ * @param has_ext 0 to add ".dll", also to a path that ends with it already; otherwise the path is
+ *                used as it is.
+ * @return the library's handle; -1 (all bits set), and never NULL, when it cannot be loaded.
+ * @par Thread safety
+ *   Safe from any thread; the platform's loader takes turns.
+ */
+ZV_API void* zv_dll_open(const char* path, int has_ext);
+
+/**
+ * Find a symbol of a library. On Linux, the libraries that it needs are searched after it.
+ *
+ * @param lib  a handle from zv_dll_open().
+ * @param name the symbol's name.
+ * @param fmt  how the name is decorated: the first "%s" stands for the name and everything else is
+ *             copied as it stands, any other `%` included, so that a template can do no harm. NULL
+ *             and "" stand for "%s".
+ * @return the symbol's address; NULL when the library does not export it, when the decorated name
+ *         is longer than 319 characters, or when `lib` is -1.
+ * @par Thread safety
+ *   Safe from any thread while the library stays open.
+ */
+ZV_API void* zv_dll_getptr(void* lib, const char* name, const char* fmt);
+
+/**
+ * Close a library.
+ *
+ * Nothing in it may be used afterwards, unless it was opened more than once.
+ *
+ * @param lib a handle from zv_dll_open(), or -1, which does nothing.
+ * @return -1, always, to be stored in the variable that held the handle.
+ * @par Thread safety
+ *   Safe from any thread, as long as none uses the library.
+ */
+ZV_API void* zv_dll_close(void* lib);
+
+/** @} */
+
+/**
+ * @defgroup plugin Plugins
+ * Find the libraries that serve an API, agree on its version with each, load and unload them.
+ *
+ * An API is a name that the host chooses, such as "img" or "img.reader". Its plugins are the files
+ * `img_*.dll` (on every platform) in one folder, which the host names in the private environment
+ * under the API's base name, the part before the first dot. Each exports one function, `zv_plugin`
+ * (#zv_plugin_entry_t), which answers the API and the range of versions that the host speaks with a
+ * descriptor (#plugin_t) or with the reason why not. For each plugin that accepts, the host gets a
+ * record (#zv_plugin_t), which keeps the plugin's formats also while its library is unloaded.
+ *
+ * A plugin is code and runs with the host's rights: name a folder that only trusted users can write
+ * to.
+ *
+ * @code
+ *   zv_plugin_t** plugins = NULL;
+ *   zv_putenv_private("img", "plugins", 0);
+ *   zv_plugin_enumerate(&plugins, "img", 1, 5, 0);                 // loads, asks and unloads each
+ *   zv_plugin_t* reader = zv_plugin_get_entry_by_fmt(plugins, "photo.png");
+ *   if (reader != NULL && zv_plugin_load(reader)) {
+ *     img_api_t* img = (img_api_t*)reader->plugin->api_entry;
+ *     ...
+ *     zv_plugin_unload(reader);
+ *   }
+ *   for (int i = 0; plugins != NULL && plugins[i] != NULL; ++i) zv_plugin_destroy(plugins[i]);
+ *   zv_free(plugins);
+ * @endcode
+ *
+ * The plugin's side, as a whole source file:
+ *
+ * @code
+ *   static plugin_t* release(plugin_t* self) { (void)self; return NULL; }
+ *   static const char* formats(void) { return "PNG image|.png|\0"; }
+ *   static img_api_t functions = {read_png};
+ *   static plugin_t descriptor = {release, formats, &functions};
+ *
+ *   ZV_PLUGIN_EXPORT plugin_t* zv_plugin(const char* api, int min, int max, int* code) {
+ *     if (strcmp(api, "img") != 0) {
+ *       *code = ZV_PLUGIN_E_API;
+ *       return NULL;
+ *     }
+ *     return zv_plugin_match_vers(min, max, 1, 2, code) ? &descriptor : NULL;
+ *   }
+ * @endcode
+ * @{
+ */
+
+/** Stands before the definition of a plugin's `zv_plugin`, in C and in C++. */
+#if defined(_WIN32)
+#define ZV_PLUGIN_VISIBLE __declspec(dllexport)
+#elif defined(__GNUC__)
+#define ZV_PLUGIN_VISIBLE __attribute__((visibility("default")))
+#else
+#define ZV_PLUGIN_VISIBLE
+#endif
+#ifdef __cplusplus
+#define ZV_PLUGIN_EXPORT extern "C" ZV_PLUGIN_VISIBLE
+#else
+#define ZV_PLUGIN_EXPORT ZV_PLUGIN_VISIBLE
+#endif
+
+/** Why there is no plugin. A code of 0 or more is a version, and other negative ones are the
+ *  plugin's own. */
+enum zv_plugin_error {
+  ZV_PLUGIN_E_MEMORY = -9,     /**< memory ran out */
+  ZV_PLUGIN_E_ARGUMENTS = -8,  /**< a NULL, a range such as 3 to 2, a library name with folders */
+  ZV_PLUGIN_E_NOT_FOUND = -7,  /**< no such folder or file, or a path that is too long */
+  ZV_PLUGIN_E_LOAD = -6,       /**< not a library, or one that the platform refuses to load */
+  ZV_PLUGIN_E_ENTRY = -5,      /**< the library does not export `zv_plugin` */
+  ZV_PLUGIN_E_API = -4,        /**< said by the plugin: it does not serve this API */
+  ZV_PLUGIN_E_DESCRIPTOR = -2, /**< the descriptor lacks one of its three fields */
+  ZV_PLUGIN_E_SILENT = -1      /**< the plugin refused without saying why */
+};
 
 typedef struct plugin_t plugin_t;
+
+/**
+ * A plugin's descriptor, which lies in the plugin's memory and lives while its library is loaded.
+ *
+ * None of the three fields may be NULL. Fields of the API's own may follow them.
+ */
 struct plugin_t {
+  /** Called once before the library is let go, with the descriptor; returns NULL. */
   plugin_t* (*release)(plugin_t* self);
+  /** The plugin's format entries (see @ref format) as a zero-separated sequence, "" for none. */
   const char* (*formats)(void);
+  /** The API's own functions or data, in whatever form host and plugin agreed on. */
   void* api_entry;
 };
 
+/**
+ * A plugin that accepted its host: where it lies, what was agreed and whether it is loaded.
+ *
+ * The host reads it and leaves every change to the functions below.
+ */
 typedef struct zv_plugin_t {
-  char* dir;
-  char* lib;
-  char** formats;
-  char* api;
-  int version;
-  int refs;
-  void* module;
-  plugin_t* plugin;
+  char* dir;        /**< the folder of the library, absolute */
+  char* lib;        /**< the library's file name */
+  char** formats;   /**< a string list of its format entries, kept while the library is unloaded */
+  char* api;        /**< the API's name */
+  int version;      /**< the agreed version; each load stores the plugin's answer anew */
+  int refs;         /**< how often it is loaded; 0: not at all */
+  void* module;     /**< the library's handle, as zv_dll_open() gives it; -1 while not loaded */
+  plugin_t* plugin; /**< the descriptor; while not loaded, what `release` returned */
 } zv_plugin_t;
 
+/**
+ * The entry that a plugin's library exports under the name `zv_plugin`.
+ *
+ * @param api  the API that the host asks for.
+ * @param min  the oldest version that the host speaks.
+ * @param max  the newest version that the host speaks, not below `min`.
+ * @param code receives the agreed version, or the reason of a refusal: #ZV_PLUGIN_E_API, the
+ *             version that the plugin could offer instead (zv_plugin_match_vers() finds either), or
+ *             a negative number of its own. It is -1 before the first call; when a plugin is loaded
+ *             again, it is the agreed version, and `min` and `max` are that version as well.
+ * @return the descriptor, or NULL to refuse.
+ */
 typedef plugin_t* (*zv_plugin_entry_t)(const char* api, int min, int max, int* code);
 
-zv_plugin_t* zv_plugin_create(const char* dir, const char* lib, const char* api, int min, int max,
-                              int* code);
-int zv_plugin_destroy(zv_plugin_t* rec);
-int zv_plugin_load(zv_plugin_t* rec);
-int zv_plugin_unload(zv_plugin_t* rec);
-int zv_plugin_add_lib(zv_plugin_t*** plugins, const char* path, const char* api, int min, int max,
-                      int* code, int keep);
-int zv_plugin_match_vers(int min, int max, int oldest, int newest, int* version);
-int zv_plugin_enumerate(zv_plugin_t*** plugins, const char* api, int min, int max, int keep);
+/**
+ * Load a plugin and make its record.
+ *
+ * A plugin that is not accepted has been released and its library closed.
+ *
+ * @param dir  the folder of the library: normalised, and made absolute from the working directory.
+ * @param lib  the library's file name, without folders.
+ * @param api  the name of the API.
+ * @param min  the oldest version that the host speaks, 0 or more.
+ * @param max  the newest version that the host speaks, not below `min`.
+ * @param code receives the agreed version; on failure a #zv_plugin_error or what the plugin
+ *             answered: the version it could offer, or a negative number of its own. May be NULL.
+ * @return the record, loaded once, to be given back with zv_plugin_destroy(); NULL when the plugin
+ *         was not accepted or memory ran out.
+ * @par Thread safety
+ *   Safe from any thread, as far as the plugin's entry is.
+ */
+ZV_API zv_plugin_t* zv_plugin_create(const char* dir, const char* lib, const char* api, int min,
+                                     int max, int* code);
 
-int zv_plugin_formats(zv_plugin_t** plugins, char*** list);
-zv_plugin_t* zv_plugin_get_entry_by_fmt(zv_plugin_t** plugins, const char* path);
-int zv_plugin_match_fmt(zv_plugin_t* rec, const char* path);
-zv_plugin_t* zv_plugin_get_entry_by_lib(zv_plugin_t** plugins, const char* lib);
-size_t zv_plugin_get_lib(zv_plugin_t** entry, char* buf, int size);
-int zv_fmt_composite(char*** list, int count, const char* description);
-size_t zv_fmt_default(const char* entry, const char** pattern);
-char* zv_fmt_force(const char* entry, char* name);
+/**
+ * Give a record back, in whatever state it is.
+ *
+ * A plugin that is loaded, however often, is released once and its library closed once.
+ *
+ * @param rec the record, or NULL, which does nothing.
+ * @return 0, always.
+ * @par Thread safety
+ *   Safe from any thread, for distinct records.
+ */
+ZV_API int zv_plugin_destroy(zv_plugin_t* rec);
+
+/**
+ * Load a plugin's library, unless it is loaded already, and count the load.
+ *
+ * The plugin is asked for exactly the version that it agreed to; `rec->version` receives its
+ * answer, also when it refuses.
+ *
+ * @param rec the record, or NULL.
+ * @return 1 when the plugin is loaded, which needs its own zv_plugin_unload(); 0 when the library
+ * or its entry is not there any more, when the plugin refuses or lacks a field of its descriptor,
+ * or for NULL.
+ * @par Thread safety
+ *   Safe from any thread, for distinct records.
+ */
+ZV_API int zv_plugin_load(zv_plugin_t* rec);
+
+/**
+ * Undo one load: the last one releases the plugin and closes its library.
+ *
+ * The record keeps its texts and formats. Unloading what is not loaded is not tested for.
+ *
+ * @param rec the record, or NULL.
+ * @return 1; 0 for NULL.
+ * @par Thread safety
+ *   Safe from any thread, for distinct records.
+ */
+ZV_API int zv_plugin_unload(zv_plugin_t* rec);
+
+/**
+ * Add one library to a plugin array.
+ *
+ * Records are told apart by file name alone, case included: a library whose file name is in the
+ * array already counts as added, and nothing is loaded.
+ *
+ * @param plugins the array: a heap block of records that ends with NULL, or NULL for none yet.
+ *                Receives its new address. A failure leaves it as it was.
+ * @param path    the library's path: normalised, and made absolute from the working directory.
+ * @param api     the name of the API.
+ * @param min     the oldest version that the host speaks, 0 or more.
+ * @param max     the newest version that the host speaks, not below `min`.
+ * @param code    receives what zv_plugin_create() stores; #ZV_PLUGIN_E_NOT_FOUND when the library
+ *                was in the array already. May be NULL.
+ * @param keep    0 to unload the plugin at once.
+ * @return 1 when the library is in the array, 0 when it is not. Destroy each record, then give the
+ *         array back with zv_free().
+ * @par Thread safety
+ *   Safe from any thread, for distinct arrays.
+ */
+ZV_API int zv_plugin_add_lib(zv_plugin_t*** plugins, const char* path, const char* api, int min,
+                             int max, int* code, int keep);
+
+/**
+ * Find the version that a host and a plugin both speak: the plugin's answer to its host.
+ *
+ * @param min     the oldest version that the host speaks.
+ * @param max     the newest version that the host speaks.
+ * @param oldest  the oldest version that the plugin speaks.
+ * @param newest  the newest version that the plugin speaks.
+ * @param version receives the newest version that both speak; when there is none, the plugin's
+ *                version that is nearest to the host's.
+ * @return 1 when there is one, 0 when there is none.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API int zv_plugin_match_vers(int min, int max, int oldest, int newest, int* version);
+
+/**
+ * Find every plugin of an API.
+ *
+ * The folder is the value of the private-environment variable named by the API's base name, else of
+ * "PLG", else of "LIB". Tried are its files `BASE_*.dll`, whatever their case, in the platform's
+ * order, hidden ones left out. Of img_a.dll and its variant with a `d` before the dot, img_ad.dll,
+ * only the first is tried.
+ *
+ * What becomes of each file is reported on standard error:
+ *
+ *     Testing library img_a.dll for img API...ok
+ *     Testing library img_b.dll for img API...
+ *             rejected: unsupported version 9
+ *
+ * with a tab before "rejected", and one of these reasons after it: "memory allocation failed",
+ * "invalid function arguments", "library could not be found", "library could not be loaded",
+ * "library does not export an zv_plugin function", "plugin does not support requested api",
+ * "plugin is not compatible with plugin_t", "plugin did not set an error code",
+ * "outdated version N", "unsupported version N", "error code N".
+ *
+ * @param plugins receives a new array of the accepted records, which ends with NULL; one that it
+ *                held is neither used nor freed. Left as it was when there is no folder or no file
+ *                to try; NULL when memory ran out.
+ * @param api     the name of the API. Its base name has 1 to 47 characters.
+ * @param min     the oldest version that the host speaks, 0 or more.
+ * @param max     the newest version that the host speaks, not below `min`.
+ * @param keep    0 to unload each plugin at once.
+ * @return how many were accepted. Destroy each record, then give the array back with zv_free().
+ * @par Thread safety
+ *   Safe from any thread, as far as the plugins' entries are. Reports that are made at the same
+ * time mix.
+ */
+ZV_API int zv_plugin_enumerate(zv_plugin_t*** plugins, const char* api, int min, int max, int keep);
+
+/**
+ * Find the record of a library.
+ *
+ * @param plugins an array of records that ends with NULL.
+ * @param lib     the library's file name, compared with its case; NULL and "" are never found.
+ * @return the first record of that name, which stays the array's; NULL when there is none.
+ * @par Thread safety
+ *   Safe from any thread while none changes the array.
+ */
+ZV_API zv_plugin_t* zv_plugin_get_entry_by_lib(zv_plugin_t** plugins, const char* lib);
+
+/**
+ * Tell a plugin's file name.
+ *
+ * @param entry where a record is held, such as an element of an array; -1 for none.
+ * @param buf   receives the name, cut silently to `size` - 1 characters; NULL to ask for its
+ * length.
+ * @param size  the buffer's size in bytes.
+ * @return how many characters `buf` holds, or the name's length when `buf` is NULL; 0 for -1.
+ * @par Thread safety
+ *   Safe from any thread while none changes the record.
+ */
+ZV_API size_t zv_plugin_get_lib(zv_plugin_t** entry, char* buf, int size);
+
+/** @} */
+
+/**
+ * @defgroup format Formats
+ * Match files to plugins by their names, without loading anything.
+ *
+ * A format entry is a text of fields, each followed by `|`: a description for people, then
+ * patterns. `PNG image|.png|.apng|` has two. A pattern that begins with a dot stands for `*` and
+ * itself; any other is one of zv_strpat(). The first is the format's default. Patterns are compared
+ * with the file name in a path, ignoring case; of a pattern, its added `*` included, 319 characters
+ * take part. A field that no `|` closes is not seen, so an entry such as `PNG image|.png` matches
+ * nothing.
+ *
+ * @code
+ *   const char* pattern;
+ *   size_t length = zv_fmt_default("PNG image|.png|.apng|", &pattern);  // ".png", 4
+ *   char name[64] = "picture";
+ *   zv_fmt_force("PNG image|.png|.apng|", name);                        // "picture.png"
+ * @endcode
+ * @{
+ */
+
+/**
+ * Collect the format entries of all plugins.
+ *
+ * @param plugins an array of records that ends with NULL, or NULL.
+ * @param list    the string list to append copies to; a NULL in it is replaced by a new list.
+ * @return how many entries were appended; one that memory ran out for is counted, though it is not
+ *         in the list.
+ * @par Thread safety
+ *   Safe from any thread while none changes the array or the list.
+ */
+ZV_API int zv_plugin_formats(zv_plugin_t** plugins, char*** list);
+
+/**
+ * Find the plugin that handles a file.
+ *
+ * @param plugins an array of records that ends with NULL.
+ * @param path    the file's path, with `/`; NULL and "" are never matched. The file need not exist.
+ * @return the first record with a pattern that matches the file's name, which stays the array's;
+ *         NULL when there is none.
+ * @par Thread safety
+ *   Safe from any thread while none changes the array.
+ */
+ZV_API zv_plugin_t* zv_plugin_get_entry_by_fmt(zv_plugin_t** plugins, const char* path);
+
+/**
+ * Tell whether a plugin handles a file.
+ *
+ * @param rec  the record.
+ * @param path the file's path, with `/`. The file need not exist.
+ * @return 1 when one of the record's patterns matches the file's name, else 0.
+ * @par Thread safety
+ *   Safe from any thread while none changes the record.
+ */
+ZV_API int zv_plugin_match_fmt(zv_plugin_t* rec, const char* path);
+
+/**
+ * Append one entry that covers others: a description, and each of their patterns once, ignoring
+ * case.
+ *
+ * Everything after an entry's first `|` is taken as it stands, so a last pattern that no `|` closes
+ * runs into the next entry's first.
+ *
+ * @param list        the string list of entries. NULL, or one without entries, gives 0.
+ * @param count       how many entries to cover, from the first; negative for all.
+ * @param description the new entry's description; NULL or "" for "All recognized formats".
+ * @return 1 when the entry was appended; 0, with the list as it was, when one of the entries has no
+ *         `|` or memory ran out.
+ * @par Thread safety
+ *   Safe from any thread while none changes the list.
+ */
+ZV_API int zv_fmt_composite(char*** list, int count, const char* description);
+
+/**
+ * Find the default pattern of an entry.
+ *
+ * @param entry   the format entry.
+ * @param pattern receives where the pattern stands in the entry; it ends with its length, not with
+ *                a NUL. Left as it was when the entry has no `|`.
+ * @return the pattern's length in bytes: up to the next `|` or the entry's end. 0 without a `|`.
+ * @par Thread safety
+ *   Safe from any thread.
+ */
+ZV_API size_t zv_fmt_default(const char* entry, const char** pattern);
+
+/**
+ * Give a file name the extension of a format, unless it has one that the format knows.
+ *
+ * An extension is known when it occurs anywhere in the entry, ignoring case. The default pattern is
+ * appended as it is written, so it should be an extension such as `.png`.
+ *
+ * @param entry the format entry.
+ * @param name  the file name, in a buffer with room for the default pattern behind it.
+ * @return where in `entry` the name's extension stands; `name`, when the default pattern was
+ *         appended; NULL when the entry has no default pattern.
+ * @par Thread safety
+ *   Safe from any thread, for distinct names.
+ */
+ZV_API char* zv_fmt_force(const char* entry, char* name);
+
+/** @} */
 
 /* ================================================================================================
  * Copying between locations

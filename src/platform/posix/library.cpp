@@ -1,0 +1,83 @@
+// Dynamic libraries: dlopen() and its kin.
+#include <dlfcn.h>
+#include <fcntl.h>
+#include <link.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <cstring>
+
+#include "platform/platform.h"
+
+namespace zv::platform {
+
+namespace {
+
+using Header = ElfW(Ehdr);
+using Segment = ElfW(Phdr);
+using Offset = ElfW(Off);
+
+// A library's file, looked at before the loader gets it.
+class LibraryFile {
+ public:
+  // A pipe must not make the opening wait.
+  explicit LibraryFile(const char* path)
+      : descriptor_(::open(path, O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC)) {}
+  ~LibraryFile() {
+    if (descriptor_ >= 0) ::close(descriptor_);
+  }
+  LibraryFile(const LibraryFile&) = delete;
+  LibraryFile& operator=(const LibraryFile&) = delete;
+
+  // dlopen() maps a file's segments without asking whether they lie in it: a library that was only
+  // copied half would end the process with SIGBUS. It would also wait for ever on a pipe.
+  bool is_whole() const {
+    struct stat st;
+    Header header;
+    if (::fstat(descriptor_, &st) != 0 || !S_ISREG(st.st_mode)) return false;
+    if (!read(header, 0) || header.e_phentsize != sizeof(Segment)) return false;
+    for (size_t i = 0; i < header.e_phnum; ++i) {
+      Segment segment;
+      if (!read(segment, header.e_phoff + i * sizeof segment)) return false;
+      if (segment.p_type == PT_LOAD && !lies_within(segment, static_cast<Offset>(st.st_size)))
+        return false;
+    }
+    return true;
+  }
+
+ private:
+  template <class Record>
+  bool read(Record& record, Offset offset) const {
+    return ::pread(descriptor_, &record, sizeof record, static_cast<off_t>(offset)) ==
+           static_cast<ssize_t>(sizeof record);
+  }
+
+  static bool lies_within(const Segment& segment, Offset size) {
+    return segment.p_offset <= size && segment.p_filesz <= size - segment.p_offset;
+  }
+
+  int descriptor_;
+};
+
+}  // namespace
+
+void* load_library(const char* path) {
+  // The empty path would name the program itself.
+  if (*path == '\0') return nullptr;
+  PathBuffer room;
+  const char* const native = native_path(path, room);
+  if (native == nullptr) return nullptr;
+  // Where the loader searches for a bare name is its own affair.
+  if (std::strchr(native, '/') != nullptr && !LibraryFile(native).is_whole()) return nullptr;
+  return dlopen(native, RTLD_NOW | RTLD_LOCAL);
+}
+
+void* library_symbol(void* library, const char* name) {
+  return dlsym(library, name);
+}
+
+void unload_library(void* library) {
+  dlclose(library);
+}
+
+}  // namespace zv::platform
