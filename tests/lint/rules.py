@@ -17,7 +17,7 @@ INCLUDE = re.compile(r"#\s*include\s*<([^>]+)>")
 STANDARD_C = re.compile(
     r"(assert|ctype|errno|float|inttypes|limits|locale|math|pthread|setjmp|stdarg|stdbool|stddef"
     r"|stdint|stdio|stdlib|string|time)\.h$")
-OTHERS = re.compile(r"CLI/|stb/|gtest/")
+OTHERS = re.compile(r"CLI/|stb/|gtest/|zarvo\.h")
 
 BANNED = {
     "sprintf": "snprintf", "vsprintf": "vsnprintf", "strcpy": "zv_strncpy or TextBuffer",
