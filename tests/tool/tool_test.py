@@ -153,6 +153,24 @@ class Tool(unittest.TestCase):
         ])
         self.assertFalse((work / "tree").exists())
 
+    def test_plugins_without_any(self):
+        (work / "img_none.dll").write_text("no library")
+        (work / "img_noned.dll").write_text("its debug build")
+        code, output, _ = self.zv("plugins", "img.reader")
+        self.assertEqual((code, output.split()), (1, "img_none.dll rejected cannot be loaded"
+                         " img_noned.dll skipped variant of img_none.dll".split()))
+        self.assertEqual(self.zv("plugins", "other")[0], 1)
+
+    @unittest.skipUnless("ZV_TEST_PLUGINS" in os.environ, "the examples are not built")
+    def test_plugins_of_the_gallery(self):
+        folder = os.environ["ZV_TEST_PLUGINS"]
+        code, output, _ = self.zv("plugins", "img", "--dir", folder, "--max", "1")
+        self.assertEqual(code, 0)
+        lines = {line.split()[0]: " ".join(line.split()[1:]) for line in output.splitlines()}
+        self.assertRegex(lines["img_bmp.dll"], r"^accepted version 1 .*\|\.bmp\|")
+        self.assertRegex(lines["img_tomorrow.dll"], r"^rejected too new: version \d")
+        self.assertEqual(self.zv("plugins", "img", "--dir", folder, "--min", "7", "--max", "5")[0], 1)
+
     def test_info_and_usage(self):
         code, output, _ = self.zv("info")
         self.assertEqual(code, 0)
@@ -161,7 +179,7 @@ class Tool(unittest.TestCase):
         self.assertEqual(self.zv("--version"), (0, "zv 1.0.0b\n", ""))
         self.assertIn("copy", self.zv("--help")[1])
         for words in ([], ["no-such"], ["copy", "one"], ["copy", "a", "b", "c"], ["match", "a"],
-                      ["copy", "a", "b", "--retries", "-1"], ["path"]):
+                      ["copy", "a", "b", "--retries", "-1"], ["path"], ["plugins", "a", "--min", "x"]):
             with self.subTest(words):
                 code, output, message = self.zv(*words)
                 self.assertEqual((code, output), (2, ""))

@@ -121,6 +121,16 @@ void add_remove(Program& program) {
       .flag("--yes", &RemoveOptions::agreed, "ask nothing");
 }
 
+void add_plugins(Program& program) {
+  add(program, "plugins", "Try each plugin library of a folder for an API", plugins)
+      .needs("API", &PluginsOptions::api, "such as img.reader, served by img_*.dll")
+      .takes("--dir", &PluginsOptions::folder, "FOLDER",
+             "where they lie, instead of the current folder")
+      .takes_number("--min", &PluginsOptions::oldest, INT_MAX, "the oldest version that will do")
+      .takes_number("--max", &PluginsOptions::newest, INT_MAX, "the newest version that will do")
+      .note("Loading a plugin runs its code. The exit code is 1 when none was accepted.");
+}
+
 void add_info(Program& program) {
   add(program, "info", "Print the version, user, host and folders", info);
 }
@@ -133,7 +143,8 @@ int run_command_line(int argc, char** argv) {
   program.app.set_version_flag("--version", std::string("zv ") + zarvo_version(),
                                "Print the version and exit");
   program.app.require_subcommand(1);
-  for (const auto add_command : {add_copy, add_scan, add_match, add_path, add_remove, add_info})
+  for (const auto add_command :
+       {add_copy, add_scan, add_match, add_path, add_remove, add_plugins, add_info})
     add_command(program);
   try {
     program.app.parse(argc, argv);

@@ -3,6 +3,7 @@
 #ifndef ZV_TOOL_COMMANDS_H
 #define ZV_TOOL_COMMANDS_H
 
+#include <climits>
 #include <string>
 
 namespace tool {
@@ -49,6 +50,14 @@ struct RemoveOptions {
   bool agreed = false;
 };
 int remove(const RemoveOptions& options);
+
+struct PluginsOptions {
+  std::string api;
+  std::string folder = ".";
+  int oldest = 0;
+  int newest = INT_MAX;
+};
+int plugins(const PluginsOptions& options);
 
 struct InfoOptions {};
 int info(const InfoOptions& options);
