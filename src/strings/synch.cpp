@@ -12,7 +12,7 @@ enum class Style { none, upper, lower, capitalised };
 // Where the name of a path and its extension lie; the dot is the end where there is no extension.
 struct Parts {
   explicit Parts(const char* path)
-      : name(path + std::string_view(path).rfind('/') + 1),  // npos + 1 is 0: the whole of it
+      : name(path + (std::string_view(path).rfind('/') + 1)),  // npos + 1 is 0: the whole of it
         dot(zv_dot(path)),
         end(dot + std::strlen(dot)) {}
 

@@ -39,6 +39,13 @@ int copy_with_retries(const CopyOptions& options) {
   return result;
 }
 
+// Why a copy between two servers cannot begin: its file rests in the temporary folder meanwhile.
+bool lacks_temporary_folder(const CopyOptions& options) {
+  char folder[ZV_PATH_MAX];
+  return is_network(options.from) && is_network(options.to) &&
+         zv_tempdir(folder, sizeof folder) == 0;
+}
+
 }  // namespace
 
 int copy(const CopyOptions& options) {
@@ -49,6 +56,8 @@ int copy(const CopyOptions& options) {
   progress.reset();
   if (result == 0) return done;
   if (result == -3) {
+    if (lacks_temporary_folder(options))
+      complain("a copy between two servers needs a temporary folder: set TMP to one");
     complain("cannot get " + options.from);
     return source_failed;
   }
