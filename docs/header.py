@@ -107,6 +107,8 @@ def read(path):
             main_page = lines[lines.index("@mainpage") + 1:]
         elif opening:
             _, name, title = opening.split(" ", 2)
+            if any(family.name == name for family in families):
+                raise ValueError(f"two families are called {name}")
             families.append(Family(name, title,
                                    [line for line in lines if line not in (opening, "@{")]))
             inside = True

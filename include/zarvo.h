@@ -62,6 +62,16 @@ extern "C" {
  *
  * All blocks come from the library's own C heap, which on Windows need not be the application's:
  * give back with zv_free() what the library handed out.
+ *
+ * @code
+ * char release[12];
+ * char* text = zv_dalloc("kept", 5);
+ * if (text == NULL) return 1;
+ * puts(text);                            // prints kept
+ * zv_free(text);
+ * zv_split_version(zarvo_version(), NULL, NULL, NULL, release);
+ * puts(release);                         // prints Beta
+ * @endcode
  * @{
  */
 
@@ -169,12 +179,12 @@ ZV_API int zv_split_version(const char* version, int* major, int* minor, int* pa
  * NULs, 5 here, but not the closing one; a buffer for it needs one byte more than its length.
  *
  * @code
- * char name[32];
- * if (zv_strncpy(name, text, sizeof name) == sizeof name - 1)
- *   ;                                         // filled to the end: text may have been cut
+ * char name[8];                                        // filled to its end: perhaps cut
+ * if (zv_strncpy(name, "abcdefghi", sizeof name) == sizeof name - 1) puts(name);  // prints abcdefg
  *
  * char patterns[] = "*.png;*.jpg;";
- * zv_strreplchr(patterns, ';', '\0');         // the sequence "*.png" "*.jpg"
+ * zv_strreplchr(patterns, ';', '\0');                  // the sequence "*.png" "*.jpg"
+ * for (char* p = patterns; *p != '\0'; p += strlen(p) + 1) puts(p);  // prints *.png *.jpg
  * @endcode
  * @{
  */
@@ -294,9 +304,12 @@ ZV_API size_t zv_strnnullcat(char* dst, const char* src, size_t size);
  *
  * @code
  * char line[80] = "  Key = value \n";
- * zv_strtrim(line);                           // "Key = value"
- * zv_strlwr(line);                            // "key = value"
- * char* rest = zv_strnrepl(line, "name", 3);  // "name = value", rest is " = value"
+ * zv_strtrim(line);
+ * zv_strlwr(line);
+ * puts(line);                                 // prints key = value
+ * char* rest = zv_strnrepl(line, "name", 3);
+ * puts(line);                                 // prints name = value
+ * puts(rest);                                 // prints = value
  * @endcode
  * @{
  */
@@ -405,8 +418,10 @@ ZV_API char* zv_strnrepl(char* dst, const char* src, int n);
  * only A to Z and a to z have case, and `_` sorts before every letter.
  *
  * @code
- * if (zv_strnicmp(line, "Content-Length:", 15) == 0) length = atol(line + 15);
- * const char* found = zv_stristr(page, "<title>");
+ * const char* line = "content-length: 42";
+ * if (zv_strnicmp(line, "Content-Length:", 15) == 0) puts(line + 15);  // prints 42
+ * const char* found = zv_stristr("<TITLE>News", "<title>");
+ * if (found != NULL) puts(found + 7);         // prints News
  * @endcode
  * @{
  */
@@ -466,9 +481,11 @@ ZV_API char* zv_stristr(const char* s, const char* needle);
  *
  * @code
  * char path[80] = "a//b//readme.txt";
- * zv_strreplstr(path, "//", "/");        // "a/b/readme.txt"
- * zv_strsynch(path, "NOTES.DOC");        // "a/b/README.TXT"
- * zv_strbrkt(path, '"', '"');            // "\"a/b/README.TXT\""
+ * zv_strreplstr(path, "//", "/");
+ * puts(path);                            // prints a/b/readme.txt
+ * zv_strsynch(path, "NOTES.DOC");
+ * zv_strbrkt(path, '"', '"');
+ * puts(path);                            // prints "a/b/README.TXT"
  * @endcode
  * @{
  */
@@ -591,7 +608,8 @@ ZV_API size_t zv_wcstostr(char* dst, const uint16_t* src);
  * other byte is a character by itself, whose value is the byte's.
  *
  * @code
- * if (zv_strpat(name, "report_[0-9]*.txt")) add(name);
+ * const char* name = "report_7.txt";
+ * if (zv_strpat(name, "report_[0-9]*.txt")) puts(name);  // prints report_7.txt
  * @endcode
  * @{
  */
@@ -631,9 +649,10 @@ ZV_API int zv_strpat(const char* text, const char* pattern);
  * @code
  * char** names;
  * int n = zv_strlist(&names, "b;a;B;", ';');
+ * if (n < 0) return 1;
  * n -= zv_strlist_iset(names, n);
  * if (zv_strlist_insert(&names, n, 0, "first")) ++n;
- * for (char** name = names; *name; ++name) puts(*name);  // first b a
+ * for (char** name = names; *name; ++name) puts(*name);  // prints first b a
  * zv_strlist_free(names, n);
  * @endcode
  * @{
@@ -835,9 +854,10 @@ ZV_API int zv_strlist_reduce(char*** list, int n, int pos);
  * zv_normalize_path(), the path map and the search path look beyond the text.
  *
  * @code
- * char path[ZV_PATH_MAX] = "~\\notes\\..\\todo.txt";
+ * char path[ZV_PATH_MAX] = "notes\\drafts\\..\\todo.txt";
  * char folder[ZV_PATH_MAX];
- * if (zv_normalize_path(path)) zv_extract_directory(path, folder, sizeof folder);
+ * if (zv_normalize_path(path) && zv_extract_directory(path, folder, sizeof folder)) puts(folder);
+ * puts(path);                            // prints notes notes/todo.txt
  * @endcode
  * @{
  */
@@ -1147,8 +1167,9 @@ ZV_API int zv_path_locate(char* path);
  *
  * @code
  * char folder[ZV_PATH_MAX];
- * if (zv_tempdir(folder, sizeof folder) == 0) return -1;
+ * if (zv_tempdir(folder, sizeof folder) == 0) return 1;
  * zv_putenv_private("PLG", "/opt/app/plugins", 0);
+ * puts(zv_getenv_private("PLG"));        // prints /opt/app/plugins
  * @endcode
  * @{
  */
@@ -1259,8 +1280,10 @@ ZV_API char* zv_getenv_private(const char* name);
  * caller's to know. Twice is the value again, bit for bit.
  *
  * @code
- * uint32_t magic = zv_swap_uint32(0x7F454C46);  // 0x464C457F
- * zv_swapv_16(samples, sample_count);           // in place
+ * uint16_t samples[] = {0x0100, 0x0200};
+ * zv_swapv_16(samples, 2);                                 // in place
+ * printf("%d %d\n", samples[0], samples[1]);               // prints 1 2
+ * printf("%08x\n", (unsigned)zv_swap_uint32(0x7F454C46));  // prints 464c457f
  * @endcode
  * @{
  */
@@ -1411,7 +1434,7 @@ ZV_API void zv_swapv(void* data, int count, size_t size);
  * char line[256];
  * FILE* const in = zv_fopen("notes.txt", "r", NULL);
  * if (in != NULL) {
- *   while (zv_fgets(line, sizeof line, in, 1) != NULL) zv_fputs(line, stdout, 0);
+ *   while (zv_fgets(line, sizeof line, in, 1) != NULL) puts(line);  // prints first second
  *   zv_fclose(in);
  * }
  * @endcode
@@ -1552,10 +1575,9 @@ ZV_API int zv_fputs(const char* s, FILE* fp, int crlf);
  * const dirsel_t images = {NULL, "*.png;*.jpg", ";", 0, 0};
  * char** list;
  * int n = zv_dir_scan("album", &list, (dir_filter_t)zv_dir_select, (void*)&images, 1, 1);
- * if (n >= 0) {
- *   for (int i = 0; i < n; ++i) puts(list[i]);
- *   zv_strlist_free(list, n);
- * }
+ * if (n < 0) return 1;
+ * printf("%d pictures, such as %s\n", n, n > 0 ? list[0] : "none");
+ * zv_strlist_free(list, n);
  * @endcode
  * @{
  */
@@ -1661,7 +1683,7 @@ ZV_API int zv_dir_select(const char* dir, const char* name, const dirsel_t* sel)
  */
 
 /**
- * @defgroup tree File status and trees
+ * @defgroup status File status
  * One path on the file system: what it is, who may use it, whether it is hidden.
  *
  * Paths are written with `/` or `\`, whichever comes to hand, on every platform. Nothing is
@@ -1670,7 +1692,7 @@ ZV_API int zv_dir_select(const char* dir, const char* name, const dirsel_t* sel)
  * @code
  * struct _stat64 st;
  * if (zv_stat("data\\input.txt", &st) == 0 && (st.st_mode & 0xF000) == 0x8000)
- *   printf("a file of %lld bytes\n", (long long)st.st_size);
+ *   printf("%lld bytes\n", (long long)st.st_size);  // prints 5 bytes
  * @endcode
  * @{
  */
@@ -2271,8 +2293,8 @@ ZV_API char* zv_fmt_force(const char* entry, char* name);
  * address, or four decimal numbers.
  *
  * @code
- * zv_copy("http://example.com/data.bin", "D:\\data.bin");
- * zv_copy("report.pdf", "ftp://user:pw@example.com/in/report.pdf");
+ * if (zv_copy("http://example.com/data.bin", "data.bin") != 0) return 1;
+ * zv_copy("report.pdf", "ftp://user:pw@example.com/pub/report.pdf");
  * zv_copy("report.pdf", "smtp://me@example.com:pw@mail.example.com/you%40example.org");
  * @endcode
  * @{
