@@ -1641,7 +1641,7 @@ ZV_API int zv_dir_readnext(intptr_t handle, char* name, size_t size);
 ZV_API intptr_t zv_dir_close(intptr_t handle);
 
 /**
- * List what a folder holds, without `.` and `..`, each folder in front of its own content.
+ * List what a folder holds, itself and its parent left out, each folder in front of its content.
  *
  * A folder that is missing or cannot be read holds nothing; that is no failure. A symbolic link is
  * an entry and is never followed, except where `dir` itself is one.
@@ -1835,10 +1835,14 @@ ZV_API int zv_rmpath(const char* path);
  * every platform. A library is code: opening it runs its start-up with the caller's rights.
  *
  * @code
- *   void* lib = zv_dll_open("codecs/fast", 0);                     // codecs/fast.dll
- *   codec_t* codec = (codec_t*)zv_dll_getptr(lib, "codec", "%s_v2");  // codec_v2
- *   ...
- *   lib = zv_dll_close(lib);
+ * typedef int (*codec_t)(void);
+ * void* lib = zv_dll_open("codecs/fast", 0);                 // codecs/fast.dll
+ * void* symbol = zv_dll_getptr(lib, "codec", "%s_v2");       // codec_v2
+ * if (symbol == NULL) return 1;
+ * codec_t codec;
+ * memcpy(&codec, &symbol, sizeof codec);                     // C knows no cast to a function
+ * printf("version %d\n", codec());                           // prints version 2
+ * lib = zv_dll_close(lib);
  * @endcode
  * @{
  */
@@ -1904,50 +1908,59 @@ ZV_API void* zv_dll_close(void* lib);
  * to.
  *
  * @code
- *   zv_plugin_t** plugins = NULL;
- *   zv_putenv_private("img", "plugins", 0);
- *   zv_plugin_enumerate(&plugins, "img", 1, 5, 0);                 // loads, asks and unloads each
- *   zv_plugin_t* reader = zv_plugin_get_entry_by_fmt(plugins, "photo.png");
- *   if (reader != NULL && zv_plugin_load(reader)) {
- *     img_api_t* img = (img_api_t*)reader->plugin->api_entry;
- *     ...
- *     zv_plugin_unload(reader);
- *   }
- *   for (int i = 0; plugins != NULL && plugins[i] != NULL; ++i) zv_plugin_destroy(plugins[i]);
- *   zv_free(plugins);
+ * typedef struct img_api_t { int (*width)(const char* path); } img_api_t;  // both sides know it
+ *
+ * zv_plugin_t** plugins = NULL;
+ * zv_putenv_private("img", "plugins", 0);
+ * zv_plugin_enumerate(&plugins, "img", 1, 5, 0);                 // loads, asks and unloads each
+ * if (plugins == NULL) return 1;
+ * zv_plugin_t* reader = zv_plugin_get_entry_by_fmt(plugins, "photo.png");
+ * if (reader != NULL && zv_plugin_load(reader)) {
+ *   img_api_t* img = (img_api_t*)reader->plugin->api_entry;
+ *   printf("%d pixels wide\n", img->width("photo.png"));         // prints 640 pixels wide
+ *   zv_plugin_unload(reader);
+ * }
+ * for (int i = 0; plugins[i] != NULL; ++i) zv_plugin_destroy(plugins[i]);
+ * zv_free(plugins);
  * @endcode
  *
  * The plugin's side, as a whole source file:
  *
  * @code
- *   static plugin_t* release(plugin_t* self) { (void)self; return NULL; }
- *   static const char* formats(void) { return "PNG image|.png|\0"; }
- *   static img_api_t functions = {read_png};
- *   static plugin_t descriptor = {release, formats, &functions};
+ * typedef struct img_api_t { int (*width)(const char* path); } img_api_t;
  *
- *   ZV_PLUGIN_EXPORT plugin_t* zv_plugin(const char* api, int min, int max, int* code) {
- *     if (strcmp(api, "img") != 0) {
- *       *code = ZV_PLUGIN_E_API;
- *       return NULL;
- *     }
- *     return zv_plugin_match_vers(min, max, 1, 2, code) ? &descriptor : NULL;
+ * static int width(const char* path) { return path[0] != '\0' ? 640 : 0; }
+ * static plugin_t* release(plugin_t* self) { (void)self; return NULL; }
+ * static const char* formats(void) { return "PNG image|.png|\0"; }
+ * static img_api_t functions = {width};
+ * static plugin_t descriptor = {release, formats, &functions};
+ *
+ * ZV_PLUGIN_EXPORT plugin_t* zv_plugin(const char* api, int min, int max, int* code);
+ *
+ * ZV_PLUGIN_EXPORT plugin_t* zv_plugin(const char* api, int min, int max, int* code) {
+ *   if (strcmp(api, "img") != 0) {
+ *     *code = ZV_PLUGIN_E_API;
+ *     return NULL;
  *   }
+ *   return zv_plugin_match_vers(min, max, 1, 2, code) ? &descriptor : NULL;
+ * }
  * @endcode
  * @{
  */
 
-/** Stands before the definition of a plugin's `zv_plugin`, in C and in C++. */
 #if defined(_WIN32)
+/** What makes a symbol of a plugin's library visible to the host. */
 #define ZV_PLUGIN_VISIBLE __declspec(dllexport)
 #elif defined(__GNUC__)
 #define ZV_PLUGIN_VISIBLE __attribute__((visibility("default")))
 #else
 #define ZV_PLUGIN_VISIBLE
 #endif
-#ifdef __cplusplus
-#define ZV_PLUGIN_EXPORT extern "C" ZV_PLUGIN_VISIBLE
-#else
+#ifndef __cplusplus
+/** Stands before the definition of a plugin's `zv_plugin`, in C and in C++. */
 #define ZV_PLUGIN_EXPORT ZV_PLUGIN_VISIBLE
+#else
+#define ZV_PLUGIN_EXPORT extern "C" ZV_PLUGIN_VISIBLE
 #endif
 
 /** Why there is no plugin. A code of 0 or more is a version, and other negative ones are the
@@ -2178,10 +2191,12 @@ ZV_API size_t zv_plugin_get_lib(zv_plugin_t** entry, char* buf, int size);
  * nothing.
  *
  * @code
- *   const char* pattern;
- *   size_t length = zv_fmt_default("PNG image|.png|.apng|", &pattern);  // ".png", 4
- *   char name[64] = "picture";
- *   zv_fmt_force("PNG image|.png|.apng|", name);                        // "picture.png"
+ * const char* pattern;
+ * char name[64] = "picture";
+ * size_t length = zv_fmt_default("PNG image|.png|.apng|", &pattern);
+ * printf("%.*s\n", (int)length, pattern);                             // prints .png
+ * zv_fmt_force("PNG image|.png|.apng|", name);
+ * puts(name);                                                         // prints picture.png
  * @endcode
  * @{
  */
@@ -2321,10 +2336,11 @@ ZV_API char* zv_fmt_force(const char* entry, char* name);
  * - A mail (RFC 5321, RFC 2045) carries the file as an attachment under its own name. It comes from
  *   the location's user when that holds an `@`, else from the local user. A user asks for a login.
  *   Addresses and the file's name stand in the mail as they are: no angle brackets are added and
- *   nothing is quoted or encoded. A recipient with a space or a comma, or a name with a `"` or with
- *   bytes beyond ASCII, is for the server and the reader to judge.
+ *   nothing is quoted or encoded. A recipient with a space or a comma, or a name with a quotation
+ * mark or with bytes beyond ASCII, is for the server and the reader to judge.
  * - Between two network locations the file goes through a private folder in the temporary folder,
- *   which is removed. The source's file name must be one that a local file can have, without `\`.
+ *   which is removed. The source's file name must be one that a local file can have, without a
+ * backslash.
  * - No text adds a command or a header line: CR or LF in the user, password or decoded path of a
  *   network location makes it unusable, and a file with one in its name is not mailed.
  *

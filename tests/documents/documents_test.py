@@ -62,14 +62,15 @@ def run(*command):
     the emulator's own processes."""
     windows = ("Z:" + str(library.parent.parent / "bin")).replace("/", "\\")
     env = dict(given, TMP=str(work), WINEPATH=windows, LD_LIBRARY_PATH=str(library.parent))
-    with tempfile.TemporaryFile("w+") as output:
+    with tempfile.TemporaryFile("w+") as output, tempfile.TemporaryFile("w+") as messages:
         done = subprocess.run([str(word) for word in command], cwd=work, env=env, stdout=output,
-                              stderr=subprocess.STDOUT, stdin=subprocess.DEVNULL, timeout=60,
+                              stderr=messages, stdin=subprocess.DEVNULL, timeout=60,
                               check=False)
         output.seek(0)
-        text = output.read()
+        messages.seek(0)
+        text, said = output.read(), messages.read()
     if done.returncode != 0:
-        raise AssertionError(f"{' '.join(map(str, command))}: {done.returncode}\n{text}")
+        raise AssertionError(f"{' '.join(map(str, command))}: {done.returncode}\n{text}{said}")
     return text
 
 
