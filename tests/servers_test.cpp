@@ -4,7 +4,6 @@
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
-#include <functional>
 #include <random>
 #include <string>
 #include <thread>
@@ -15,6 +14,7 @@
 namespace {
 
 namespace fs = std::filesystem;
+using Sizes = std::initializer_list<size_t>;
 
 std::string set(const char* name) {
   const char* const value = std::getenv((std::string("ZARVO_TEST_") + name).c_str());
@@ -92,7 +92,7 @@ void check_route(const Place& source, const Place& destination, size_t size) {
 TEST(Servers, EveryRouteAndSize) {
   for (const Place& source : places()) {
     for (const Place& destination : places()) {
-      for (const size_t size : {1, 511, 512, 513, (1 << 20) + 1})
+      for (const size_t size : Sizes{1, 511, 512, 513, (1 << 20) + 1})
         check_route(source, destination, size);
       if (source.url.starts_with("/")) check_route(source, destination, 0);
     }
@@ -134,7 +134,7 @@ TEST(Servers, MailOfEverySizeAndLogin) {
   const Place local = places().front();
   const Mail mails[] = {{"SMTP_PORT", false}, {"SMTP_LOGIN_PORT", true}, {"SMTP_PLAIN_PORT", true}};
   for (const Mail& mail : mails) {
-    for (const size_t size : {0, 1, 47, 48, 49, 511, 512, 513}) check_mail(local, mail, size);
+    for (const size_t size : Sizes{0, 1, 47, 48, 49, 511, 512, 513}) check_mail(local, mail, size);
     check_mail(local, mail, (1 << 20) + 1);
   }
   for (const Place& source : places()) check_mail(source, mails[0], 100);
