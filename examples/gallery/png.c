@@ -33,8 +33,7 @@ static void put_number(chunk_t* chunk, unsigned long value) {
 }
 
 static chunk_t begin(FILE* file, const char* type, unsigned long size) {
-  chunk_t chunk;
-  chunk.file = file;
+  chunk_t chunk = {file, 0};
   put_number(&chunk, size);
   chunk.crc = 0xfffffffful;
   put(&chunk, (const unsigned char*)type, 4);

@@ -49,8 +49,10 @@ static int decode_samples(cursor_t* in, img_picture_t* picture, int text, size_t
     const int repeated = channels == 1 && i % 3 != 0;
     const long value = repeated ? 0 : text ? number(in) : sample(in, largest);
     if (value < 0 || value > largest) return 0;
-    picture->rgb[i] =
-        repeated ? picture->rgb[i - 1] : (unsigned char)((value * 255 + largest / 2) / largest);
+    if (repeated)
+      picture->rgb[i] = picture->rgb[i - 1];
+    else
+      picture->rgb[i] = (unsigned char)((value * 255 + largest / 2) / largest);
   }
   return 1;
 }
