@@ -166,7 +166,9 @@ class Tool(unittest.TestCase):
         folder = os.environ["ZV_TEST_PLUGINS"]
         code, output, _ = self.zv("plugins", "img", "--dir", folder, "--max", "1")
         self.assertEqual(code, 0)
-        lines = {line.split()[0]: " ".join(line.split()[1:]) for line in output.splitlines()}
+        # A debug build's plugins are named with a "d" at the end.
+        lines = {line.split()[0].replace("d.dll", ".dll"): " ".join(line.split()[1:])
+                 for line in output.splitlines()}
         self.assertRegex(lines["img_bmp.dll"], r"^accepted version 1 .*\|\.bmp\|")
         self.assertRegex(lines["img_tomorrow.dll"], r"^rejected too new: version \d")
         self.assertEqual(self.zv("plugins", "img", "--dir", folder, "--min", "7", "--max", "5")[0], 1)
