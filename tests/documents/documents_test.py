@@ -76,7 +76,7 @@ def run(*command):
 
 def build(text, program, *words):
     file = work / "example.c"
-    file.write_text(text)
+    file.write_text(text + "\n")
     run(cc, *WARNINGS, "-I", source / "include", file, "-o", program, *words, library)
     return program
 
