@@ -6,6 +6,7 @@
 #include <bit>
 #include <cstdlib>
 #include <cstring>
+#include <utility>
 
 #include "frame/owner.h"
 #include "platform/platform.h"
@@ -52,18 +53,14 @@ class Index {
   zv::HeapPtr<Slot[]> slots_;
 };
 
-// Frees every entry that `seen(entry, kept)` knows and moves the others up. Gives how many it
-// freed.
+// Moves every entry that `seen(entry, kept)` knows behind the others and frees it there. Gives how
+// many it freed.
 template <class Seen>
 int keep_unseen(char** list, int count, Seen seen) {
   int kept = 0;
-  for (int i = 0; i < count; ++i) {
-    if (seen(list[i], kept)) {
-      std::free(list[i]);
-    } else {
-      list[kept++] = list[i];
-    }
-  }
+  for (int i = 0; i < count; ++i)
+    if (!seen(list[i], kept)) std::swap(list[kept++], list[i]);
+  std::for_each(list + kept, list + count, std::free);
   if (kept != count) list[kept] = nullptr;
   return count - kept;
 }
