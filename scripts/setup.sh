@@ -7,6 +7,7 @@ server_packages=(nginx-light vsftpd python3-aiosmtpd)
 test_packages=("${build_packages[@]}" "${server_packages[@]}" attr valgrind)
 windows_packages=(g++-mingw-w64-x86-64-posix wine64 llvm)
 lint_packages=(clang clang-format clang-tidy libclang-rt-14-dev cppcheck shellcheck)
+bench_packages=(libbenchmark-dev libapr1-dev libaprutil1-dev libglib2.0-dev libcurl4-openssl-dev)
 docs_packages=(doxygen)
 package_packages=(dpkg-dev file gzip man-db util-linux abigail-tools)
 
