@@ -12,7 +12,7 @@ namespace zv::platform {
 namespace {
 
 bool identity(FILE* stream, BY_HANDLE_FILE_INFORMATION& out) {
-  const auto handle = reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(stream)));
+  void* const handle = reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(stream)));
   return handle != INVALID_HANDLE_VALUE && GetFileInformationByHandle(handle, &out) != 0;
 }
 
