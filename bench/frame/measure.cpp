@@ -1,6 +1,8 @@
 // The frame around an item: its cases are compared, then measured.
 #include "frame/measure.h"
 
+#include <time.h>
+
 #include <cstdio>
 #include <cstdlib>
 #include <map>
@@ -15,6 +17,12 @@ void expect_same_answer(const std::string& what, const std::string& who, uint64_
                static_cast<unsigned long long>(answer),
                static_cast<unsigned long long>(first->second));
   std::exit(1);
+}
+
+double cpu_seconds() {
+  timespec now{};
+  clock_gettime(CLOCK_THREAD_CPUTIME_ID, &now);
+  return static_cast<double>(now.tv_sec) + 1e-9 * static_cast<double>(now.tv_nsec);
 }
 
 }  // namespace bench

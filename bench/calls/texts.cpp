@@ -1,0 +1,197 @@
+// Texts without case, trimmed, changed in case, replaced in: 64 bytes and 64 KiB.
+#include <glib.h>
+#include <strings.h>
+
+#include <algorithm>
+#include <cctype>
+#include <cstring>
+#include <string>
+#include <vector>
+
+#include "frame/measure.h"
+#include "zarvo.h"
+
+namespace {
+
+const bench::Item item("texts");
+
+std::string prose(size_t size) {
+  const std::string line = "The quick brown fox jumps over the lazy dog; Pack My Box, 12 times. ";
+  std::string text;
+  while (text.size() < size) text += line;
+  text.resize(size);
+  return text;
+}
+
+// Short texts come by the hundred, so that the clock is not what is measured.
+size_t how_many(size_t size) {
+  return size < 1000 ? 100 : 1;
+}
+
+std::string sized(const char* what, size_t size) {
+  return std::string(what) + (size < 1000 ? ", 64 bytes" : ", 64 KiB");
+}
+
+bool same_letter(char a, char b) {
+  return std::tolower(static_cast<unsigned char>(a)) == std::tolower(static_cast<unsigned char>(b));
+}
+
+// Texts to be edited in place, each with room to grow.
+class Texts {
+ public:
+  explicit Texts(const std::string& text)
+      : room_(2 * text.size() + 64), copies_(how_many(text.size())) {
+    block_.resize(room_ * copies_);
+    for (size_t i = 0; i < copies_; ++i)
+      std::memcpy(&block_[i * room_], text.c_str(), text.size() + 1);
+  }
+
+  template <class Edit>
+  void edit(Edit edit_one) {
+    for (size_t i = 0; i < copies_; ++i) edit_one(&block_[i * room_]);
+  }
+
+  std::string result() const { return block_.data(); }
+
+ private:
+  size_t room_;
+  size_t copies_;
+  std::vector<char> block_;
+};
+
+size_t hash(const std::string& text) {
+  return std::hash<std::string>()(text);
+}
+
+template <class Edit>
+void add_edit(const std::string& what, const char* who, const std::string& text, Edit edit) {
+  item.add_prepared(
+      what, who, [=] { return Texts(text); }, [=](Texts& texts) { texts.edit(edit); },
+      [](const Texts& texts) { return hash(texts.result()); });
+}
+
+// The same for texts of the C++ library.
+template <class Edit>
+void add_string_edit(const std::string& what, const char* who, const std::string& text, Edit edit) {
+  item.add_prepared(
+      what, who, [=] { return std::vector<std::string>(how_many(text.size()), text); },
+      [=](std::vector<std::string>& texts) { std::for_each(texts.begin(), texts.end(), edit); },
+      [](const std::vector<std::string>& texts) { return hash(texts[0]); });
+}
+
+// GString frees nothing by itself.
+class GTexts {
+ public:
+  explicit GTexts(const std::string& text) {
+    for (size_t i = 0; i < how_many(text.size()); ++i) texts_.push_back(g_string_new(text.c_str()));
+  }
+  GTexts(GTexts&& other) noexcept = default;
+  GTexts& operator=(GTexts&&) = delete;
+  ~GTexts() {
+    for (GString* const text : texts_) g_string_free(text, 1);
+  }
+
+  const std::vector<GString*>& all() const { return texts_; }
+
+ private:
+  std::vector<GString*> texts_;
+};
+
+void add_search(const std::string& what, const std::string& text, const std::string& needle) {
+  item.add(what, "zarvo", [=] { return zv_stristr(text.c_str(), needle.c_str()) - text.c_str(); });
+  item.add(what, "strcasestr",
+           [=] { return strcasestr(text.c_str(), needle.c_str()) - text.c_str(); });
+  item.add(what, "std::search", [=] {
+    return std::search(text.begin(), text.end(), needle.begin(), needle.end(), same_letter) -
+           text.begin();
+  });
+  item.add(what, "g_ascii_strdown and strstr", [=] {
+    char* const lower = g_ascii_strdown(text.c_str(), -1);
+    const auto place = std::strstr(lower, needle.c_str()) - lower;
+    g_free(lower);
+    return place;
+  });
+}
+
+void add_compare(size_t size) {
+  const std::string a = prose(size);
+  std::string b = a;
+  std::transform(b.begin(), b.end(), b.begin(), [](unsigned char ch) { return std::toupper(ch); });
+  const std::string what = sized("compare without case", size);
+  item.add(what, "zarvo", [=] { return zv_stricmp(a.c_str(), b.c_str()) == 0; });
+  item.add(what, "strcasecmp", [=] { return strcasecmp(a.c_str(), b.c_str()) == 0; });
+  item.add(what, "g_ascii_strcasecmp",
+           [=] { return g_ascii_strcasecmp(a.c_str(), b.c_str()) == 0; });
+  item.add(what, "std::equal",
+           [=] { return std::equal(a.begin(), a.end(), b.begin(), b.end(), same_letter); });
+}
+
+void add_trim(size_t size) {
+  const std::string text = "   \t " + prose(size - 11) + ".\n   \r\n";
+  const std::string what = sized("trim", size);
+  add_edit(what, "zarvo", text, zv_strtrim);
+  add_edit(what, "g_strstrip", text, [](char* s) { g_strstrip(s); });
+  add_string_edit(what, "std::find_if_not and erase", text, [](std::string& s) {
+    const auto is_space = [](unsigned char ch) { return std::isspace(ch) != 0; };
+    s.erase(std::find_if_not(s.rbegin(), s.rend(), is_space).base(), s.end());
+    s.erase(s.begin(), std::find_if_not(s.begin(), s.end(), is_space));
+  });
+}
+
+void add_case(size_t size) {
+  const std::string text = prose(size);
+  const std::string what = sized("upper case", size);
+  add_edit(what, "zarvo", text, zv_strupr);
+  add_edit(what, "g_ascii_strup", text, [](char* s) {
+    char* const upper = g_ascii_strup(s, -1);
+    std::strcpy(s, upper);
+    g_free(upper);
+  });
+  add_string_edit(what, "std::transform", text, [](std::string& s) {
+    std::transform(s.begin(), s.end(), s.begin(),
+                   [](unsigned char ch) { return std::toupper(ch); });
+  });
+}
+
+void replace_by_find(std::string& s, const std::string& needle, const std::string& repl) {
+  std::string made;
+  size_t start = 0;
+  for (size_t place = s.find(needle); place != std::string::npos; place = s.find(needle, start)) {
+    made.append(s, start, place - start).append(repl);
+    start = place + needle.size();
+  }
+  s = made.append(s, start);
+}
+
+void add_replace(const char* name, size_t size, const std::string& needle,
+                 const std::string& repl) {
+  const std::string text = prose(size);
+  const std::string what = sized(name, size);
+  add_edit(what, "zarvo", text, [=](char* s) { zv_strreplstr(s, needle.c_str(), repl.c_str()); });
+  add_string_edit(what, "std::string built anew", text,
+                  [=](std::string& s) { replace_by_find(s, needle, repl); });
+  item.add_prepared(
+      what, "g_string_replace", [=] { return GTexts(text); },
+      [=](GTexts& texts) {
+        for (GString* const one : texts.all())
+          g_string_replace(one, needle.c_str(), repl.c_str(), 0);
+      },
+      [](const GTexts& texts) { return hash(texts.all()[0]->str); });
+}
+
+}  // namespace
+
+void bench::add_cases() {
+  for (const size_t size : {size_t{64}, size_t{64} << 10}) {
+    add_search(sized("search without case", size), prose(size - 6) + "nEEdle", "needle");
+    add_compare(size);
+    add_trim(size);
+    add_case(size);
+    add_replace("replace all, longer", size, "o", "[o]");
+    add_replace("replace all, shorter", size, "quick", "q");
+    add_replace("replace all, same length", size, "fox", "cat");
+  }
+  const std::string letters(64 << 10, 'a');
+  const std::string needle = std::string(15, 'a') + 'b' + std::string(48, 'a');
+  add_search("search without case, a needle nearly everywhere", letters + needle, needle);
+}
