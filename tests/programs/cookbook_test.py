@@ -1,0 +1,134 @@
+#!/usr/bin/env python3
+"""Runs each program of the cookbook as its first line says, and against what may go wrong. Mail
+goes to the server that tests/servers/with_servers runs.
+
+    cookbook_test.py PROGRAMS WORK_FOLDER PLUGINS [EMULATOR]
+"""
+import os
+import shutil
+import struct
+import sys
+import unittest
+from pathlib import Path
+
+from http_server import HttpServer
+from programs import as_windows, start
+
+
+class Cookbook(unittest.TestCase):
+    def setUp(self):
+        shutil.rmtree(work, ignore_errors=True)
+        for name, text in {"tree/a.txt": "12345", "tree/sub/B.TXT": "123456789", "tree/c.txt": "1",
+                           "tree/d.bin": "12345", "file": ""}.items():
+            (work / name).parent.mkdir(parents=True, exist_ok=True)
+            (work / name).write_text(text)
+
+    def run_program(self, program, *words, **environment):
+        path = programs / (program + suffix) if isinstance(program, str) else program
+        return start(*emulator, path, *words, cwd=work,
+                     env={"WINEPATH": as_windows(programs), **environment})
+
+    def check(self, code, output, program, *words, **environment):
+        """One that fails says why, and names itself; one that does not says nothing."""
+        found = self.run_program(program, *words, **environment)
+        self.assertEqual(found[:2], (code, output), found[2])
+        self.assertEqual(found[2].startswith(f"{Path(program).stem}: "), code == 1, found[2])
+
+    def test_usage(self):
+        for name in ("big_endian", "find_plugin", "moved", "recent", "report", "retry", "walk"):
+            code, output, message = self.run_program(name)
+            self.assertEqual((code, output), (2, ""), name)
+            self.assertTrue(message.startswith(f"usage: {name} "), message)
+
+    def test_settings(self):
+        program = work / "app" / ("settings" + suffix)
+        program.parent.mkdir()
+        shutil.copy(programs / program.name, program)
+        settings = program.parent / "settings.ini"
+        self.check(1, "", program)
+        settings.write_bytes(b"# colours\r\nback = blue sky \r\n\nname=\n")
+        found = 'back is "blue sky"\nname is ""\n'
+        self.check(0, found, program)
+        self.check(0, found, Path("app", program.name))
+        if not emulator:
+            path = f"{program.parent}:{os.environ['PATH']}"
+            self.assertEqual(start("sh", "-c", "settings", cwd=work, env={"PATH": path})[1], found)
+        settings.write_text("back\n")
+        self.check(1, "", program)
+
+    def test_walk(self):
+        self.check(0, "tree/a.txt\ntree/sub/B.TXT\n2 files, 14 bytes\n", "walk", "tree", "*.txt;*.x",
+                   "5")
+        self.check(0, "0 files, 0 bytes\n", "walk", "tree", "*.x", "0")
+        self.check(1, "", "walk", "no-such", "*", "0")
+
+    @unittest.skipUnless(len(sys.argv) > 3 and sys.argv[3], "the gallery's plugins are not built")
+    def test_find_plugin(self):
+        code, output, _ = self.run_program("find_plugin", plugins, "no-such.BMP")
+        self.assertEqual(code, 0)
+        self.assertRegex(output, r"^img_bmpd?\.dll, version 2: Windows bitmap\n$")
+        for folder, name in ((plugins, "a.txt"), ("no-such", "a.bmp")):
+            code, output, message = self.run_program("find_plugin", folder, name)
+            self.assertEqual((code, output), (1, ""))
+            self.assertIn(f"no plugin in {folder} reads {name}\n", message)
+
+    def test_retry(self):
+        for broken, code, kept in ((2, 0, HttpServer.BODY), (3, 1, b"old")):
+            (work / "got").write_bytes(b"old")
+            server = HttpServer(broken)
+            found = self.run_program("retry", server.url, "got")
+            self.assertEqual(found[0], code, found[2])
+            self.assertEqual(server.connections, 3)
+            self.assertTrue((work / "got").read_bytes() == kept)
+            self.assertFalse((work / "got.part").exists())
+        self.check(1, "", "retry", "file", "no-such/x")
+
+    def test_recent(self):
+        for name in "one", "two", "three", "four", "five", "TWO":
+            found = self.run_program("recent", "list", name)
+        expected = "TWO\nfive\nfour\nthree\none\n"
+        self.assertEqual(found, (0, expected, ""))
+        self.check(0, "six\n" + expected[:-4], "recent", "list", "six")
+        self.assertEqual((work / "list").read_text(), "six\n" + expected[:-4])
+        self.check(1, "", "recent", "tree", "a folder is no list")
+
+    def test_moved(self):
+        place = as_windows(work).replace("\\", "/") if emulator else str(work)
+        self.check(0, f"tree/a.txt: {place}/new/a.txt\n"
+                   f"tree\\sub\\B.TXT: {place}/new/sub/B.TXT\nfile: {place}/file\n",
+                   "moved", "tree", "new", "tree/a.txt", "tree\\sub\\B.TXT", "file")
+        self.assertFalse((work / "tree").exists())
+        self.assertEqual(self.run_program("moved", "new", "tree", "new/lost")[:2],
+                         (1, "new/lost: not found\n"))
+        self.check(1, "", "moved", "no-such", "elsewhere")
+
+    def test_big_endian(self):
+        header = struct.pack(">6I", 0x2E736E64, 28, 12, 3, 8000, 2)
+        samples = struct.pack(">6h", 1, -2, 300, -32768, 5, 6)
+        (work / "sound").write_bytes(header + b"note" + samples)
+        self.check(0, "8000 Hz, 2 channels, 3 samples in each, loudest 32768\n", "big_endian", "sound")
+        for other in (header[:20], header[::-1] + samples, header[:12] + bytes(12)):
+            (work / "other").write_bytes(other)
+            self.check(1, "", "big_endian", "other")
+        self.check(1, "", "big_endian", "no-such")
+
+    def test_report(self):
+        login = f"{os.environ['ZARVO_TEST_USER']}:{os.environ['ZARVO_TEST_PASSWORD']}"
+        server = f"{login}@127.0.0.1:{os.environ['ZARVO_TEST_SMTP_LOGIN_PORT']}"
+        temporary = work / "temporary"
+        temporary.mkdir()
+        self.check(0, "", "report", f"smtp://{server}/cook@example.org", TMP=str(temporary))
+        mail = Path(os.environ["ZARVO_TEST_MAIL_DIR"], "cook@example.org")
+        self.assertEqual((mail / "name").read_text(), "report.txt")
+        self.assertTrue((mail / "attachment").read_text().startswith("All is well on "))
+        self.check(1, "", "report", "smtp://127.0.0.1:1/cook@example.org", TMP=str(temporary))
+        self.assertEqual(list(temporary.iterdir()), [])
+        if not emulator:  # Wine replaces a TMP that names no folder by its own
+            self.check(1, "", "report", f"smtp://{server}/cook@example.org", TMP="no-such")
+
+
+if __name__ == "__main__":
+    programs, work = (Path(word).resolve() for word in sys.argv[1:3])
+    plugins, emulator = sys.argv[3], sys.argv[4:]
+    suffix = ".exe" if emulator else ""
+    unittest.main(argv=["cookbook_test.py", "-v"])
