@@ -28,7 +28,7 @@ if(ZARVO_PACKAGES AND NOT WIN32)
   set(pc_prefix /usr)  # by that name pkg-config knows what every compiler searches anyway
 endif()
 get_target_property(private_libraries zarvo_static INTERFACE_LINK_LIBRARIES)
-list(TRANSFORM private_libraries PREPEND -l)
+list(TRANSFORM private_libraries PREPEND -l REGEX "^[^-]")
 list(JOIN private_libraries " " private_libraries)
 if(NOT TARGET zarvo)
   set(public_libraries " ${private_libraries}")
@@ -39,4 +39,8 @@ install(FILES include/zarvo.h DESTINATION ${CMAKE_INSTALL_INCLUDEDIR} COMPONENT 
 
 if(TARGET zv)
   install(TARGETS zv RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT tool)
+  if(NOT WIN32)
+    install(FILES tools/zv/completion.bash RENAME zv
+      DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions COMPONENT tool)
+  endif()
 endif()

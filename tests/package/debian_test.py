@@ -13,7 +13,7 @@ import tempfile
 import unittest
 from pathlib import Path
 
-from installed import CONSUMER, Installed, run
+from installed import CONSUMER, Installed, run, start
 
 NAMES = ["libzarvo1", "libzarvo-dev", "zv"]
 
@@ -44,7 +44,7 @@ class Debian(unittest.TestCase):
             self.assertNotIn("/usr", " ".join(self.installed.pkg_config(*words)))
         self.assertEqual(self.installed.with_pkg_config(CONSUMER / "consumer.c"), "consumer: ok\n")
         self.assertEqual(self.installed.static_with_pkg_config(), "consumer: ok\n")
-        self.assertEqual(self.installed.with_cmake(), ["consumer: ok"] * 2)
+        self.assertEqual(self.installed.with_cmake(), ["consumer: ok\n"] * 2)
 
     def test_1_dependencies(self):
         """An application's package finds out by itself what it depends on."""
@@ -55,15 +55,23 @@ class Debian(unittest.TestCase):
         self.assertIn("libzarvo1 (>= 1.0.0~beta)", found)
 
     def test_1_tool(self):
-        self.assertTrue(run("zv", "--version").startswith("zv 1.0.0b"))
-        self.assertIn("1.0.0b", run("zv", "info"))
+        self.assertEqual(run("zv", "--version"), "zv 1.0.0b\n")
+        completion = "/usr/share/bash-completion/completions/zv"
+        self.assertIn("zv", run("bash", "-c", f"source {completion} && complete -p zv"))
+
+    def test_1_examples(self):
+        build = self.installed.root / "examples"
+        run("cmake", "-S", "/usr/share/doc/libzarvo-dev/examples", "-B", build, "-G", "Ninja")
+        run("cmake", "--build", build)
+        self.assertIn("examples/bin/walk\n", run(build / "bin/walk", build, "walk", "1"))
 
     def test_1_documents(self):
-        for name, title in (("zarvo", "same application code"), ("zv_copy", "Copying between"),
-                            ("zarvo_strlist", "String lists")):
-            page = run("man", "--warnings", "-P", "cat", "3", name)
+        for section, name, title in (
+                (3, "zarvo", "same application code"), (3, "zv_copy", "Copying between"),
+                (3, "zarvo_strlist", "String lists"), (1, "zv", "the same on every platform")):
+            code, page, warnings = start("man", "--warnings", "-P", "cat", section, name)
+            self.assertEqual((code, warnings), (0, ""))
             self.assertIn(title, page)
-            self.assertNotIn("warning", page)
         for name in NAMES:
             folder = Path("/usr/share/doc", name)
             self.assertIn("MIT License", (folder / "copyright").read_text())

@@ -1,27 +1,15 @@
 """An installed library, as its users meet it: where pkg-config and CMake find it, and applications
 built against it and run."""
-import os
 import re
-import subprocess
-import tempfile
+import sys
 from pathlib import Path
 
 SOURCE = Path(__file__).resolve().parents[2]
+sys.path.append(str(SOURCE / "tests/programs"))
+from programs import as_windows, run, start  # noqa: E402  pylint: disable=wrong-import-position
+
 CONSUMER = SOURCE / "tests/package/consumer"
 WARNINGS = ["-Wall", "-Wextra", "-Wpedantic", "-Wconversion", "-Wshadow", "-Werror"]
-
-
-def run(*command, **more):
-    """The output of a command, which must succeed. It goes to a file: a pipe would stay open as
-    long as the emulator's own processes, which outlive the program."""
-    with tempfile.TemporaryFile("w+") as output:
-        done = subprocess.run([str(word) for word in command], stdout=output,
-                              stderr=subprocess.STDOUT, timeout=120, check=False, **more)
-        output.seek(0)
-        text = output.read()
-    if done.returncode != 0:
-        raise AssertionError(f"{' '.join(map(str, command))}: {done.returncode}\n{text}")
-    return text
 
 
 class Installed:
@@ -34,17 +22,15 @@ class Installed:
         root.mkdir(parents=True, exist_ok=True)
 
     def run_program(self, program, *words, **more):
-        env = dict(os.environ)
+        env = {}
         if self.prefix:
-            env.update(LD_LIBRARY_PATH=str(self.prefix / "lib"),
-                       WINEPATH="Z:" + str(self.prefix / "bin").replace("/", "\\"))
+            env = {"LD_LIBRARY_PATH": str(self.prefix / "lib"),
+                   "WINEPATH": as_windows(self.prefix / "bin")}
         emulator = [self.emulator] if self.emulator else []
         return run(*emulator, program, *words, env=env, **{"cwd": self.root, **more})
 
     def pkg_config(self, *words):
-        env = dict(os.environ)
-        if self.prefix:
-            env.update(PKG_CONFIG_LIBDIR=str(self.prefix / "lib/pkgconfig"))
+        env = {"PKG_CONFIG_LIBDIR": str(self.prefix / "lib/pkgconfig")} if self.prefix else None
         return run("pkg-config", *words, "zarvo", env=env).split()
 
     def compile(self, source, *words):
@@ -75,5 +61,5 @@ class Installed:
         run("cmake", "--fresh", "-S", CONSUMER, "-B", build, "-G", "Ninja", *place, *toolchain,
             *definitions)
         run("cmake", "--build", build)
-        return [self.run_program(program).strip() for program in sorted((build / "bin").iterdir())
+        return [self.run_program(program) for program in sorted((build / "bin").iterdir())
                 if program.suffix in ("", ".exe")]

@@ -10,11 +10,12 @@ import os
 import random
 import re
 import shutil
-import subprocess
 import tempfile
 import unittest
 import zlib
 from pathlib import Path
+
+from programs import as_windows, run, start
 
 LINE = re.compile(r"(\S+) +(?:(\S.*?) +(\d+) x (\d+) +#([0-9a-f]{6})|no plugin|not readable)$")
 BOX, GAP, BAR, COLUMNS = 128, 12, 8, 4
@@ -70,18 +71,17 @@ class Gallery(unittest.TestCase):
         self.start(args.make_samples, "pictures")
 
     def start(self, program, *words):
-        done = subprocess.run([*args.emulator, program, *words], cwd=self.folder, env=args.env,
-                              stdout=subprocess.PIPE, stderr=subprocess.PIPE, text=True,
-                              timeout=200, check=False)
-        self.assertEqual(done.returncode, 0, done.stderr)
-        return done
+        code, output, messages = start(*args.emulator, program, *words, cwd=self.folder,
+                                       env=args.env)
+        self.assertEqual(code, 0, messages)
+        return output, messages
 
     def show(self, pictures="pictures", plugins=None):
         """The gallery's lines by file name, and its report."""
-        done = self.start(args.gallery, plugins or args.plugins, pictures, "sheet.png")
-        lines = [LINE.match(line) for line in done.stdout.splitlines()]
-        self.assertNotIn(None, lines, done.stdout)
-        return {line[1]: line for line in lines}, done.stderr
+        output, report = self.start(args.gallery, plugins or args.plugins, pictures, "sheet.png")
+        lines = [LINE.match(line) for line in output.splitlines()]
+        self.assertNotIn(None, lines, output)
+        return {line[1]: line for line in lines}, report
 
     def sample(self, name):
         return (self.folder / "pictures" / name).read_bytes()
@@ -211,9 +211,9 @@ def build_outside(found):
                     ["cmake", "-S", examples, "-B", root / "build", "-G", "Ninja",
                      f"-DCMAKE_PREFIX_PATH={prefix}", *choice],
                     ["cmake", "--build", root / "build"]):
-        subprocess.run(command, check=True, stdout=subprocess.PIPE, timeout=200)
+        run(*command)
     suffix = ".exe" if found.toolchain else ""
-    found.env = dict(os.environ, WINEPATH="Z:" + str(prefix / "bin").replace("/", "\\"))
+    found.env = {"WINEPATH": as_windows(prefix / "bin")}
     found.words = [root / "build/bin" / ("gallery" + suffix),
                    root / "build/bin" / ("make_samples" + suffix), root / "build/gallery_plugins"]
 

@@ -1,41 +1,18 @@
 #!/usr/bin/env python3
 """Runs the tool zv as a shell would and looks at what it prints and at its exit codes.
 
-    tool_test.py ZV WORK_FOLDER [EMULATOR]
+    tool_test.py ZV WORK_FOLDER PLUGINS [EMULATOR]
 """
+import json
 import os
 import shutil
-import socket
 import subprocess
 import sys
-import tempfile
-import threading
-import time
 import unittest
 from pathlib import Path
 
-
-class HttpServer:
-    """Breaks its first connections off; then answers each with a body that comes in two halves."""
-
-    def __init__(self, broken, pause=0.0):
-        self.listener = socket.create_server(("127.0.0.1", 0))
-        self.url = "http://127.0.0.1:%d/x" % self.listener.getsockname()[1]
-        self.broken = broken
-        self.pause = pause
-        self.connections = 0
-        threading.Thread(target=self.serve, daemon=True).start()
-
-    def serve(self):
-        while True:
-            with self.listener.accept()[0] as client:
-                self.connections += 1
-                if self.connections <= self.broken:
-                    continue
-                client.recv(4096)
-                client.sendall(b"HTTP/1.0 200 OK\r\nContent-Length: 2001000\r\n\r\n" + b"1" * 2000000)
-                time.sleep(self.pause)
-                client.sendall(b"2" * 1000)
+from http_server import HttpServer
+from programs import as_windows, start
 
 
 class Tool(unittest.TestCase):
@@ -47,17 +24,7 @@ class Tool(unittest.TestCase):
             path.write_bytes(b"content of " + name.encode() + b"\r\n\0")
 
     def zv(self, *words, **environment):
-        """Exit code, standard output and standard error, line ends as on Linux. Both go to files:
-        a pipe would stay open as long as the emulator's own processes, which outlive the tool."""
-        with tempfile.TemporaryFile() as output, tempfile.TemporaryFile() as messages:
-            done = subprocess.run([*emulator, tool, *words], cwd=work, stdin=subprocess.DEVNULL,
-                                  stdout=output, stderr=messages, timeout=60, check=False,
-                                  env=dict(os.environ, **environment))
-            texts = []
-            for file in (output, messages):
-                file.seek(0)
-                texts.append(file.read().decode().replace("\r\n", "\n"))
-        return (done.returncode, *texts)
+        return start(*emulator, tool, *words, cwd=work, env=environment)
 
     def check(self, rows):
         """Rows of a command line, its exit code and its output; one that fails says why."""
@@ -82,6 +49,8 @@ class Tool(unittest.TestCase):
             (["path", "relative", "/a/b/f.txt", "--base", "/a/c"], 0, "../b/f.txt\n"),
             (["path", "relative", "D:/a", "--base", "D:/A"], 0, ".\n"),
             (["path", "split", "//srv/share/a/b"], 0, "//srv/share/\na\nb\n"),
+            (["path", "split", "/a", "--json"], 0, '["/", "a"]\n'),
+            (["path", "normalize", r"a\b", "--json"], 0, '"a/b"\n'),
             (["path", "locate", "no-such-program"], 1, ""),
         ])
         path = {"WINEPATH" if emulator else "PATH": seen_by_tool(work / "tree")}
@@ -99,9 +68,22 @@ class Tool(unittest.TestCase):
             (["scan", "tree", "--dirs", "s*"], 0, "sub\n"),
             (["scan", "tree/", "--recursive", "--files", "*.bin;a*"], 0,
              "tree/a.TXT\ntree/sub/x.bin\n"),
+            (["scan", "tree", "--json"], 0, '["a.TXT", "b.txt", "sub"]\n'),
+            (["scan", "tree", "--files", "*.no", "--json"], 0, "[]\n"),
             (["scan", "no-such"], 1, ""),
             (["scan", "tree/b.txt"], 1, ""),
         ])
+
+    @unittest.skipIf(len(sys.argv) > 4, "Windows has no such names")
+    def test_json_of_any_name(self):
+        """What is no UTF-8 comes back as the very bytes by Python's own way to keep them."""
+        names = [b'"\\', b"\t\x7f\x01", "\u00fc\u20ac\U0001f600".encode(), b"\xc3", b"\xff\xfe", b"\xc0\xaf",
+                 b"\xed\xa0\x80", b"\xf4\x90\x80\x80", b"\xf0\x9f\x98", b"\xe0\x80\x80", b"a\xe2\x82b"]
+        (work / "names").mkdir()
+        for name in names:
+            (work / "names" / os.fsdecode(name)).write_text("")
+        code, output, _ = self.zv("scan", "names", "--json")
+        self.assertEqual((code, sorted(map(os.fsencode, json.loads(output)))), (0, sorted(names)))
 
     def test_copy(self):
         self.check([
@@ -123,9 +105,9 @@ class Tool(unittest.TestCase):
                 server = HttpServer(broken=2)
                 self.assertEqual(self.zv("copy", server.url, "got", "--retries", retries)[0], code)
                 self.assertEqual(server.connections, connections)
-        self.assertEqual((work / "got").read_bytes(), b"1" * 2000000 + b"2" * 1000)
+        self.assertEqual((work / "got").read_bytes(), HttpServer.BODY)
 
-    @unittest.skipUnless(os.name == "posix" and len(sys.argv) == 3, "needs a terminal of Linux")
+    @unittest.skipUnless(len(sys.argv) == 4, "needs a terminal of Linux")
     def test_progress_is_for_a_terminal(self):
         for quiet in ([], ["--quiet"]):
             terminal, end = os.openpty()
@@ -159,27 +141,35 @@ class Tool(unittest.TestCase):
         code, output, _ = self.zv("plugins", "img.reader")
         self.assertEqual((code, output.split()), (1, "img_none.dll rejected cannot be loaded"
                          " img_noned.dll skipped variant of img_none.dll".split()))
-        self.assertEqual(self.zv("plugins", "other")[0], 1)
+        code, output, _ = self.zv("plugins", "img", "--json")
+        self.assertEqual((code, json.loads(output)), (1, [
+            {"library": "img_none.dll", "status": "rejected", "reason": "cannot be loaded"},
+            {"library": "img_noned.dll", "status": "skipped", "reason": "variant of img_none.dll"}]))
+        self.assertEqual(self.zv("plugins", "other", "--json")[:2], (1, "[]\n"))
 
-    @unittest.skipUnless("ZV_TEST_PLUGINS" in os.environ, "the examples are not built")
+    @unittest.skipUnless(len(sys.argv) > 3 and sys.argv[3], "the examples are not built")
     def test_plugins_of_the_gallery(self):
-        folder = os.environ["ZV_TEST_PLUGINS"]
-        code, output, _ = self.zv("plugins", "img", "--dir", folder, "--max", "1")
+        words = ("plugins", "img", "--dir", plugins, "--max", "1")
+        code, output, _ = self.zv(*words)
         self.assertEqual(code, 0)
         # A debug build's plugins are named with a "d" at the end.
-        lines = {line.split()[0].replace("d.dll", ".dll"): " ".join(line.split()[1:])
-                 for line in output.splitlines()}
-        self.assertRegex(lines["img_bmp.dll"], r"^accepted version 1 .*\|\.bmp\|")
-        self.assertRegex(lines["img_tomorrow.dll"], r"^rejected too new: version \d")
-        self.assertEqual(self.zv("plugins", "img", "--dir", folder, "--min", "7", "--max", "5")[0], 1)
+        self.assertRegex(output, r"(?m)^img_bmpd?\.dll +accepted +version 1  Windows bitmap\|\.bmp\|")
+        self.assertRegex(output, r"(?m)^img_tomorrowd?\.dll +rejected  too new: version \d+$")
+        found = json.loads(self.zv(*words, "--json")[1])
+        bmp, = (plugin for plugin in found if plugin["library"].startswith("img_bmp"))
+        self.assertEqual((bmp["status"], bmp["version"], bmp["formats"]),
+                         ("accepted", 1, ["Windows bitmap|.bmp|.dib|"]))
+        self.assertEqual(self.zv("plugins", "img", "--dir", plugins, "--min", "7", "--max", "5")[0], 1)
 
     def test_info_and_usage(self):
         code, output, _ = self.zv("info")
         self.assertEqual(code, 0)
-        self.assertIn("version  1.0.0b (Beta)\n", output)
-        self.assertIn("current  " + seen_by_tool(work).replace("\\", "/") + "\n", output)
+        rows = dict(line.split(None, 1) for line in output.splitlines())
+        self.assertEqual((rows["version"], rows["release"]), ("1.0.0b", "Beta"))
+        self.assertEqual(rows["current"], seen_by_tool(work).replace("\\", "/"))
+        self.assertEqual({name: value or "none" for name, value in
+                          json.loads(self.zv("info", "--json")[1]).items()}, rows)
         self.assertEqual(self.zv("--version"), (0, "zv 1.0.0b\n", ""))
-        self.assertIn("copy", self.zv("--help")[1])
         for words in ([], ["no-such"], ["copy", "one"], ["copy", "a", "b", "c"], ["match", "a"],
                       ["copy", "a", "b", "--retries", "-1"], ["path"], ["plugins", "a", "--min", "x"]):
             with self.subTest(words):
@@ -196,12 +186,10 @@ class Tool(unittest.TestCase):
 
 
 def seen_by_tool(path):
-    """A path of this machine as the tool writes it: under the emulator / is drive Z."""
-    return "Z:" + str(path).replace("/", "\\") if emulator else str(path)
+    return as_windows(path) if emulator else str(path)
 
 
 if __name__ == "__main__":
-    tool = Path(sys.argv[1]).resolve()
-    work = Path(sys.argv[2]).resolve()
-    emulator = sys.argv[3:]
+    tool, work = (Path(word).resolve() for word in sys.argv[1:3])
+    plugins, emulator = sys.argv[3], sys.argv[4:]
     unittest.main(argv=["tool_test.py", "-v"])

@@ -26,6 +26,7 @@ struct ScanOptions {
   bool recursive = false;
   bool hidden = false;
   bool match_case = false;
+  bool json = false;
 };
 int scan(const ScanOptions& options);
 
@@ -38,6 +39,7 @@ int match(const MatchOptions& options);
 struct PathOptions {
   std::string path;
   std::string base;  // empty: the current folder
+  bool json = false;
 };
 int path_normalize(const PathOptions& options);
 int path_absolute(const PathOptions& options);
@@ -56,10 +58,13 @@ struct PluginsOptions {
   std::string folder = ".";
   int oldest = 0;
   int newest = INT_MAX;
+  bool json = false;
 };
 int plugins(const PluginsOptions& options);
 
-struct InfoOptions {};
+struct InfoOptions {
+  bool json = false;
+};
 int info(const InfoOptions& options);
 
 // A message for a person, on standard error.

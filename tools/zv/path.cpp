@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "commands.h"
+#include "json.h"
 #include "path_text.h"
 
 namespace tool {
@@ -10,6 +11,10 @@ namespace {
 
 const char* base_of(const PathOptions& options) {
   return options.base.empty() ? nullptr : options.base.c_str();
+}
+
+void print(const PathOptions& options, const char* path) {
+  std::puts(options.json ? json_string(path).c_str() : path);
 }
 
 }  // namespace
@@ -21,7 +26,7 @@ int path_normalize(const PathOptions& options) {
     complain("cannot be normalised: " + options.path);
     return no;
   }
-  std::puts(path.c_str());
+  print(options, path.c_str());
   return done;
 }
 
@@ -33,7 +38,7 @@ int path_absolute(const PathOptions& options) {
     complain("leads to no place: " + options.path);
     return no;
   }
-  std::puts(path.c_str());
+  print(options, path.c_str());
   return done;
 }
 
@@ -44,7 +49,7 @@ int path_relative(const PathOptions& options) {
     complain("has nothing in common with the base: " + options.path);
     return no;
   }
-  std::puts(*path.c_str() == '\0' ? "." : path.c_str());
+  print(options, *path.c_str() == '\0' ? "." : path.c_str());
   return done;
 }
 
@@ -52,15 +57,21 @@ int path_split(const PathOptions& options) {
   PathText path;
   if (!path.assign(options.path)) return no;
   zv_split_path(path.data());
-  for (const char* piece = path.c_str(); *piece != '\0'; piece += std::strlen(piece) + 1)
-    std::puts(piece);
+  std::vector<std::string> pieces;
+  for (const char* piece = path.c_str(); *piece != '\0'; piece += std::strlen(piece) + 1) {
+    if (options.json)
+      pieces.push_back(json_string(piece));
+    else
+      std::puts(piece);
+  }
+  if (options.json) std::puts(json_array(pieces).c_str());
   return done;
 }
 
 int path_locate(const PathOptions& options) {
   PathText path;
   if (!path.assign(options.path) || zv_path_locate(path.data()) == 0) return no;
-  std::puts(path.c_str());
+  print(options, path.c_str());
   return done;
 }
 

@@ -4,6 +4,7 @@
 
 #include "commands.h"
 #include "folder.h"
+#include "json.h"
 
 namespace tool {
 namespace {
@@ -41,24 +42,24 @@ std::string reason(int code, const PluginsOptions& options) {
   return "refused with code " + number;
 }
 
-std::string formats_of(const zv_plugin_t& plugin) {
-  std::string formats;
-  for (char** entry = plugin.formats; *entry != nullptr; ++entry)
-    formats += (formats.empty() ? "" : "; ") + std::string(*entry);
-  return formats;
-}
+// What became of one library.
+struct Verdict {
+  std::string library;
+  const char* status;  // accepted, rejected or skipped
+  std::string reason;  // empty where it was accepted
+  int version = 0;     // as agreed
+  std::vector<std::string> formats{};
+};
 
-// One line of the table; true when the library was accepted.
-bool try_library(const PluginsOptions& options, const char* name) {
+Verdict try_library(const PluginsOptions& options, const char* name) {
   int code = 0;
   const PluginPtr plugin(zv_plugin_create(options.folder.c_str(), name, options.api.c_str(),
                                           options.oldest, options.newest, &code));
-  if (plugin == nullptr) {
-    std::printf("%-24s rejected  %s\n", name, reason(code, options).c_str());
-    return false;
-  }
-  std::printf("%-24s accepted  version %d  %s\n", name, code, formats_of(*plugin).c_str());
-  return true;
+  if (plugin == nullptr) return {name, "rejected", reason(code, options)};
+  Verdict verdict = {name, "accepted", "", code};
+  for (char** entry = plugin->formats; *entry != nullptr; ++entry)
+    verdict.formats.emplace_back(*entry);
+  return verdict;
 }
 
 // The library passes over img_ad.dll, a debug build, where img_a.dll lies beside it.
@@ -71,6 +72,34 @@ const char* original_of(const char* name, const Listing& candidates) {
   return nullptr;
 }
 
+Verdict verdict_on(const PluginsOptions& options, const char* name, const Listing& candidates) {
+  const char* const original = original_of(name, candidates);
+  if (original == nullptr) return try_library(options, name);
+  return {name, "skipped", std::string("variant of ") + original};
+}
+
+void print_line(const Verdict& verdict) {
+  std::string text = verdict.reason;
+  if (text.empty()) text = "version " + std::to_string(verdict.version) + "  ";
+  for (const std::string& entry : verdict.formats)
+    text += (&entry == verdict.formats.data() ? "" : "; ") + entry;
+  std::printf("%-24s %-8s  %s\n", verdict.library.c_str(), verdict.status, text.c_str());
+}
+
+std::string as_json(const Verdict& verdict) {
+  std::vector<std::pair<const char*, std::string>> members = {
+      {"library", json_string(verdict.library)}, {"status", json_string(verdict.status)}};
+  if (!verdict.reason.empty()) {
+    members.emplace_back("reason", json_string(verdict.reason));
+    return json_object(members);
+  }
+  std::vector<std::string> formats;
+  for (const std::string& entry : verdict.formats) formats.push_back(json_string(entry));
+  members.emplace_back("version", std::to_string(verdict.version));
+  members.emplace_back("formats", json_array(formats));
+  return json_object(members);
+}
+
 }  // namespace
 
 int plugins(const PluginsOptions& options) {
@@ -79,15 +108,19 @@ int plugins(const PluginsOptions& options) {
   selection.file_patterns = pattern.c_str();
   Listing candidates;
   if (!is_folder(options.folder) || !candidates.scan(options.folder, &selection, false)) return no;
-  bool any = false;
+  int exit_code = no;
+  std::vector<std::string> values;
   for (const char* const name : candidates.names()) {
-    if (const char* const original = original_of(name, candidates))
-      std::printf("%-24s skipped   variant of %s\n", name, original);
+    const Verdict verdict = verdict_on(options, name, candidates);
+    if (verdict.reason.empty()) exit_code = done;
+    if (options.json)
+      values.push_back(as_json(verdict));
     else
-      any = try_library(options, name) || any;
+      print_line(verdict);
   }
+  if (options.json) std::puts(json_array(values).c_str());
   if (candidates.names().empty()) complain("no " + pattern + " in " + options.folder);
-  return any ? done : no;
+  return exit_code;
 }
 
 }  // namespace tool

@@ -3,8 +3,19 @@
 
 #include "commands.h"
 #include "folder.h"
+#include "json.h"
 
 namespace tool {
+namespace {
+
+void print_json(std::span<char*> names) {
+  std::vector<std::string> values;
+  for (const char* const name : names) values.push_back(json_string(name));
+  std::puts(json_array(values).c_str());
+}
+
+}  // namespace
+
 int scan(const ScanOptions& options) {
   const bool everything = options.files.empty() && options.folders.empty();
   dirsel_t selection = {};
@@ -16,7 +27,10 @@ int scan(const ScanOptions& options) {
   Listing found;
   if (!is_folder(options.folder) || !found.scan(options.folder, &selection, options.recursive))
     return no;
-  for (const char* const name : found.names()) std::puts(name);
+  if (options.json)
+    print_json(found.names());
+  else
+    for (const char* const name : found.names()) std::puts(name);
   return done;
 }
 
