@@ -11,7 +11,10 @@ set_target_properties(zarvo PROPERTIES
 
 if(WIN32)
   set_target_properties(zarvo PROPERTIES PREFIX "" IMPORT_PREFIX "lib" DLL_NAME_WITH_SOVERSION OFF)
-  target_sources(zarvo PRIVATE ${CMAKE_CURRENT_BINARY_DIR}/zarvo.def)
+  enable_language(RC)
+  configure_file(version.rc.in version.rc @ONLY)
+  target_sources(zarvo PRIVATE ${CMAKE_CURRENT_BINARY_DIR}/zarvo.def
+                               ${CMAKE_CURRENT_BINARY_DIR}/version.rc)
   target_link_libraries(zarvo PRIVATE ws2_32 advapi32 pthread ssp)
   target_link_options(zarvo PRIVATE -Wl,--high-entropy-va,--dynamicbase,--nxcompat)
   # libzarvo.dll.a comes from the linker; other compilers' import library, zarvo.lib, from LLVM.
