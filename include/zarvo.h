@@ -2141,7 +2141,7 @@ ZV_API int zv_plugin_match_vers(int min, int max, int oldest, int newest, int* v
  *
  * @param plugins receives a new array of the accepted records, which ends with NULL; one that it
  *                held is neither used nor freed. Left as it was when there is no folder or no file
- *                to try; NULL when memory ran out.
+ *                to try, or no memory to list them; NULL when memory for the array ran out.
  * @param api     the name of the API. Its base name has 1 to 47 characters.
  * @param min     the oldest version that the host speaks, 0 or more.
  * @param max     the newest version that the host speaks, not below `min`.

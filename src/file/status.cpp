@@ -44,7 +44,6 @@ int zv_get_hidden(const char* path) {
 int zv_set_hidden(const char* path, int hidden) {
   const bool wanted = hidden != 0;
   return on_native(path, [wanted](const char* native) -> int {
-           if (!exists(native)) return 0;
-           return platform::is_hidden(native) == wanted || platform::set_hidden(native, wanted);
+           return exists(native) && platform::set_hidden(native, wanted);
          }) > 0;
 }

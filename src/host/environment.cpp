@@ -1,10 +1,11 @@
 // The private environment: one table for the process, behind one lock.
+#include "host/environment.h"
+
 #include <pthread.h>
 
 #include <cstdlib>
 #include <cstring>
 
-#include "frame/owner.h"
 #include "host/variable_table.h"
 #include "zarvo.h"
 
@@ -21,8 +22,22 @@ bool holds_separator(const char* text) {
 
 }  // namespace
 
+bool zv::get_private(const char* name, HeapPtr<char>& values) {
+  values.reset();
+  const LockGuard lock(mutex);
+  if (!lock.held()) return false;
+  const std::string_view found = table.values(name);
+  if (found.empty()) return true;
+  values.reset(static_cast<char*>(std::malloc(found.size() + 1)));
+  if (values == nullptr) return false;
+  std::memcpy(values.get(), found.data(), found.size());
+  values.get()[found.size()] = '\0';
+  return true;
+}
+
 int zv_putenv_private(const char* name, const char* value, int append) {
   const zv::LockGuard lock(mutex);
+  if (!lock.held()) return 0;
   if (name == nullptr) {
     table.clear();
     return 1;
@@ -36,12 +51,6 @@ int zv_putenv_private(const char* name, const char* value, int append) {
 }
 
 char* zv_getenv_private(const char* name) {
-  const zv::LockGuard lock(mutex);
-  const std::string_view values = table.values(name);
-  if (values.empty()) return nullptr;
-  char* const copy = static_cast<char*>(std::malloc(values.size() + 1));
-  if (copy == nullptr) return nullptr;
-  std::memcpy(copy, values.data(), values.size());
-  copy[values.size()] = '\0';
-  return copy;
+  zv::HeapPtr<char> values;
+  return zv::get_private(name, values) ? values.release() : nullptr;
 }

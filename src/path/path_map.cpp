@@ -104,12 +104,14 @@ int zv_pathmap(const char* from, const char* to) {
   if (from_folder.view() == to_folder.view()) return 0;
 
   const zv::LockGuard lock(mutex);
+  if (!lock.held()) return 0;
   Redirect* const found = find(from_folder.view());
   return found != redirects.end() ? change(*found, to_folder) : add(from_folder, to_folder);
 }
 
 void zv_pathmap_clear() {
   const zv::LockGuard lock(mutex);
+  if (!lock.held()) return;
   for (const Redirect& entry : redirects) {
     std::free(entry.from);
     std::free(entry.to);
@@ -126,6 +128,7 @@ int zv_pathmap_locate(char* path) {
   zv::file_name(path, name);
 
   const zv::LockGuard lock(mutex);
+  if (!lock.held()) return 0;
   for (const Redirect& entry : redirects) {
     zv::PathBuffer candidate;
     if (!candidate_for(entry, folder.view(), name.view(), candidate)) continue;

@@ -28,7 +28,7 @@ int make_directory(const char* path);
 
 // The platform's hidden attribute of a path that exists.
 bool is_hidden(const char* path);
-bool set_hidden(const char* path, bool hidden);
+bool set_hidden(const char* path, bool hidden);  // writes nothing where it is so already
 
 // ---- folders.cpp: folders that the process knows ------------------------------------------------
 
@@ -83,8 +83,8 @@ int seek(FILE* stream, int64_t offset, int origin);
 int64_t tell(FILE* stream);
 // Opens for writing, made when missing and not emptied, so that identity can be looked at first.
 FILE* open_unemptied(const char* path);
-bool same_file(FILE* a, FILE* b);
-bool empty_file(FILE* stream);  // true also for what has no length, such as a device
+bool different_files(FILE* a, FILE* b);  // false also when that cannot be told
+bool empty_file(FILE* stream);           // true also for what has no length, such as a device
 
 // ---- copy.cpp: file contents that the system moves by itself ------------------------------------
 

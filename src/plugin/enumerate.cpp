@@ -3,7 +3,7 @@
 #include <cstdlib>
 #include <cstring>
 
-#include "frame/owner.h"
+#include "host/environment.h"
 #include "plugin/answer.h"
 #include "plugin/candidates.h"
 #include "plugin/loaded_plugin.h"
@@ -25,10 +25,13 @@ bool base_name(const char* api, BaseName& base) {
   return base.assign({api, std::strcspn(api, ".")}) && !base.empty();
 }
 
+// The first variable that is set. Where memory for its value is short, no other stands in: that
+// would load what lies in another folder.
 zv::HeapPtr<char> folder_setting(const BaseName& base) {
+  zv::HeapPtr<char> value;
   for (const char* const variable : {base.c_str(), "PLG", "LIB"})
-    if (char* const value = zv_getenv_private(variable)) return zv::HeapPtr<char>(value);
-  return nullptr;
+    if (!zv::get_private(variable, value) || value != nullptr) break;
+  return value;
 }
 
 bool plugin_folder(const BaseName& base, zv::PathBuffer& folder) {

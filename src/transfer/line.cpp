@@ -12,7 +12,7 @@ bool build_line(LineBuffer& line, Pieces pieces) {
 bool send_all(platform::Socket socket, std::string_view bytes) {
   while (!bytes.empty()) {
     const int64_t sent = platform::socket_send(socket, bytes.data(), bytes.size());
-    if (sent < 0) return false;
+    if (sent <= 0) return false;
     bytes.remove_prefix(static_cast<size_t>(sent));
   }
   return true;

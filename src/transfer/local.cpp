@@ -44,7 +44,7 @@ int copy_local(const char* source, const char* destination) {
   if (!read_block(in.get(), block, got)) return source_failed;
 
   StreamPtr out(platform::open_unemptied(destination));
-  if (out == nullptr || platform::same_file(in.get(), out.get()) ||
+  if (out == nullptr || !platform::different_files(in.get(), out.get()) ||
       !platform::empty_file(out.get()))
     return destination_failed;
   std::setvbuf(out.get(), block + block_size + stream_size, _IOFBF, stream_size);

@@ -3,7 +3,9 @@
 #include <pwd.h>
 #include <unistd.h>
 
+#include <array>
 #include <cstdlib>
+#include <span>
 
 #include "frame/owner.h"
 #include "platform/platform.h"
@@ -13,19 +15,22 @@ namespace zv::platform {
 namespace {
 
 // Lets `use` see the user's record, whose texts live no longer than the call. False when there is
-// no record or no memory for one.
+// no record or no memory for one, which nearly every record does without.
 template <class Use>
 bool with_user_record(uid_t user, Use use) {
-  constexpr size_t first_size = 1024;
   constexpr size_t last_size = size_t{1} << 20;
-  for (size_t size = first_size; size <= last_size; size *= 2) {
-    const HeapPtr<char[]> room(static_cast<char*>(std::malloc(size)));
-    if (room == nullptr) return false;
+  std::array<char, 1024> first_room;
+  HeapPtr<char[]> larger_room;
+  std::span<char> room = first_room;
+  while (room.data() != nullptr && room.size() <= last_size) {
     struct passwd record;
     struct passwd* found = nullptr;
-    const int error = ::getpwuid_r(user, &record, room.get(), size, &found);
+    const int error = ::getpwuid_r(user, &record, room.data(), room.size(), &found);
     if (error == 0) return found != nullptr && use(*found);
     if (error != ERANGE) return false;
+    const size_t size = 2 * room.size();
+    larger_room.reset(static_cast<char*>(std::malloc(size)));
+    room = {larger_room.get(), size};
   }
   return false;
 }

@@ -29,9 +29,12 @@ bool parse_attributes(const AttributeText& text, unsigned& bits) {
   return parsed.ec == std::errc() && parsed.ptr == end;
 }
 
-// A path without the attribute has no bit set. False for a value that is not plain hex text, which
-// belongs to somebody else's scheme, and where the file system keeps no attributes.
-bool read_attributes(const char* path, unsigned& bits) {
+// `foreign`: never hidden, and not to be made so. That is a value other than plain hex text, which
+// belongs to somebody else's scheme, and a path where no attributes are kept.
+enum class Attributes { known, foreign, unreadable };
+
+// A path without the attribute has no bit set.
+Attributes read_attributes(const char* path, unsigned& bits) {
   bits = 0;
   AttributeText text;
   ssize_t length = -1;
@@ -40,8 +43,11 @@ bool read_attributes(const char* path, unsigned& bits) {
     if (length >= 0) room[length] = '\0';
     return length >= 0;
   });
-  if (!read) return errno == ENODATA;
-  return text.size() == static_cast<size_t>(length) && parse_attributes(text, bits);
+  if (!read && errno == ENODATA) return Attributes::known;
+  if (!read)
+    return errno == ENOTSUP || errno == ERANGE ? Attributes::foreign : Attributes::unreadable;
+  const bool whole = text.size() == static_cast<size_t>(length);
+  return whole && parse_attributes(text, bits) ? Attributes::known : Attributes::foreign;
 }
 
 bool write_attributes(const char* path, unsigned bits) {
@@ -78,13 +84,15 @@ int make_directory(const char* path) {
 
 bool is_hidden(const char* path) {
   unsigned bits = 0;
-  return read_attributes(path, bits) && (bits & hidden_bit) != 0;
+  return read_attributes(path, bits) == Attributes::known && (bits & hidden_bit) != 0;
 }
 
 bool set_hidden(const char* path, bool hidden) {
   unsigned bits = 0;
-  if (!read_attributes(path, bits)) return false;
-  return write_attributes(path, hidden ? bits | hidden_bit : bits & ~hidden_bit);
+  const Attributes attributes = read_attributes(path, bits);
+  if (attributes != Attributes::known) return attributes == Attributes::foreign && !hidden;
+  const unsigned wanted = hidden ? bits | hidden_bit : bits & ~hidden_bit;
+  return wanted == bits || write_attributes(path, wanted);
 }
 
 }  // namespace zv::platform

@@ -26,11 +26,11 @@ FILE* open_unemptied(const char* path) {
   return stream;
 }
 
-bool same_file(FILE* a, FILE* b) {
+bool different_files(FILE* a, FILE* b) {
   struct stat first;
   struct stat second;
   return ::fstat(::fileno(a), &first) == 0 && ::fstat(::fileno(b), &second) == 0 &&
-         first.st_dev == second.st_dev && first.st_ino == second.st_ino;
+         (first.st_dev != second.st_dev || first.st_ino != second.st_ino);
 }
 
 bool empty_file(FILE* stream) {

@@ -33,7 +33,8 @@ bool set_hidden(const char* path, bool hidden) {
   const DWORD attributes = GetFileAttributesA(path);
   if (attributes == INVALID_FILE_ATTRIBUTES) return false;
   const DWORD others = attributes & ~static_cast<DWORD>(FILE_ATTRIBUTE_HIDDEN);
-  return SetFileAttributesA(path, hidden ? others | FILE_ATTRIBUTE_HIDDEN : others) != 0;
+  const DWORD wanted = hidden ? others | FILE_ATTRIBUTE_HIDDEN : others;
+  return wanted == attributes || SetFileAttributesA(path, wanted) != 0;
 }
 
 }  // namespace zv::platform

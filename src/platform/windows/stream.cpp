@@ -11,9 +11,17 @@ namespace zv::platform {
 
 namespace {
 
+HANDLE handle_of(FILE* stream) {
+  return reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(stream)));
+}
+
+// A device, a pipe or a console has no identity, and is no file of a disk.
+bool is_on_disk(FILE* stream) {
+  return GetFileType(handle_of(stream)) == FILE_TYPE_DISK;
+}
+
 bool identity(FILE* stream, BY_HANDLE_FILE_INFORMATION& out) {
-  void* const handle = reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(stream)));
-  return handle != INVALID_HANDLE_VALUE && GetFileInformationByHandle(handle, &out) != 0;
+  return GetFileInformationByHandle(handle_of(stream), &out) != 0;
 }
 
 }  // namespace
@@ -39,13 +47,14 @@ FILE* open_unemptied(const char* path) {
   return stream;
 }
 
-bool same_file(FILE* a, FILE* b) {
+bool different_files(FILE* a, FILE* b) {
+  if (!is_on_disk(a) || !is_on_disk(b)) return true;
   BY_HANDLE_FILE_INFORMATION first;
   BY_HANDLE_FILE_INFORMATION second;
   return identity(a, first) && identity(b, second) &&
-         first.dwVolumeSerialNumber == second.dwVolumeSerialNumber &&
-         first.nFileIndexHigh == second.nFileIndexHigh &&
-         first.nFileIndexLow == second.nFileIndexLow;
+         (first.dwVolumeSerialNumber != second.dwVolumeSerialNumber ||
+          first.nFileIndexHigh != second.nFileIndexHigh ||
+          first.nFileIndexLow != second.nFileIndexLow);
 }
 
 bool empty_file(FILE* stream) {
