@@ -3,10 +3,7 @@
 
 #include <cstring>
 #include <string>
-#include <thread>
-#include <vector>
 
-#include "failing_allocation.h"
 #include "zarvo.h"
 
 namespace {
@@ -78,79 +75,6 @@ TEST_F(Environment, ManyVariables) {
     zv_strupr(other_case.data());
     ASSERT_EQ(get(other_case.c_str()), expected[i % 3]);
   }
-}
-
-// As many variables as there are buckets, so that one more also asks for more of those.
-void fill_table() {
-  zv_putenv_private(nullptr, nullptr, 0);
-  for (int i = 0; i < 16; ++i) zv_putenv_private(std::to_string(i).c_str(), "kept", 0);
-}
-
-TEST_F(Environment, OutOfMemory) {
-  const std::string long_value(100, 'v');
-  const struct {
-    const char* name;
-    const char* value;
-    int append;
-    int failures;        // allocations that can fail
-    const char* before;  // what a failure leaves
-    std::string after;
-  } cases[] = {
-      {"7", long_value.c_str(), 1, 1, "kept|", "kept|" + long_value + "|"},
-      {"7", "anew", 0, 2, "none", "anew|"},
-      {"new", "v", 0, 3, "none", "v|"},
-      {"new", "v", 1, 3, "none", "v|"},
-  };
-  for (const auto& c : cases) {
-    SCOPED_TRACE(c.name);
-    int result = -1;
-    const auto put = [&] { result = zv_putenv_private(c.name, c.value, c.append); };
-    fill_table();
-    EXPECT_EQ(fail_each_allocation(put,
-                                   [&] {
-                                     EXPECT_EQ(get(c.name), result == 1 ? c.after : c.before);
-                                     EXPECT_EQ(get("8"), "kept|");
-                                     fill_table();
-                                   }),
-              c.failures);
-    EXPECT_EQ(result, 1);
-    EXPECT_EQ(get(c.name), c.after);
-  }
-
-  zv_putenv_private(nullptr, nullptr, 0);
-  const FailingAllocation failing(0);
-  EXPECT_EQ(zv_putenv_private("A", "v", 0), 0);
-  EXPECT_TRUE(failing.happened());
-  EXPECT_EQ(get("A"), "none");
-}
-
-TEST_F(Environment, NoMemoryForTheCopy) {
-  zv_putenv_private("A", "v", 0);
-  const FailingAllocation failing(0);
-  EXPECT_EQ(zv_getenv_private("A"), nullptr);
-  EXPECT_EQ(get("A"), "v|");
-}
-
-// Each thread sees its own variable as it left it, and the shared one whole.
-TEST_F(Environment, EightThreads) {
-  const auto work = [](int thread) {
-    const std::string own = "own" + std::to_string(thread);
-    for (int round = 0; round < 300; ++round) {
-      const std::string value = std::to_string(round);
-      zv_putenv_private(own.c_str(), value.c_str(), 0);
-      zv_putenv_private("SHARED", own.c_str(), round % 50);
-      zv_putenv_private((own + value).c_str(), "made", 0);
-      if (round > 10) zv_putenv_private((own + std::to_string(round - 10)).c_str(), nullptr, 0);
-      zv_putenv_private(own.c_str(), "last", 1);
-      ASSERT_EQ(get(own.c_str()), value + "|last|");
-      const std::string shared = get("shared");
-      ASSERT_EQ(shared.substr(0, 3), "own");
-      ASSERT_EQ(shared.size() % 5, 0u);
-    }
-  };
-  std::vector<std::thread> threads;
-  for (int i = 0; i < 8; ++i) threads.emplace_back(work, i);
-  for (std::thread& thread : threads) thread.join();
 }
 
 }  // namespace

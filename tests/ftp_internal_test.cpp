@@ -133,10 +133,6 @@ TEST(Ftp, PathsInCommands) {
 
 TEST(Ftp, LocalSideFails) {
   const ScratchFolder folder;
-  DialogueServer server(server_of());
-  if (std::filesystem::exists("/dev/full")) {
-    EXPECT_EQ(zv_copy(server.url("ftp", "/f").c_str(), "/dev/full"), -4);
-  }
   const std::string closed = "ftp://127.0.0.1:" + std::to_string(closed_port()) + "/f";
   EXPECT_EQ(zv_copy(closed.c_str(), folder.path("missing/new").c_str()), -4);
   EXPECT_EQ(zv_copy(folder.path("missing").c_str(), closed.c_str()), -3);

@@ -3,11 +3,8 @@
 
 #include <cstring>
 #include <string>
-#include <thread>
-#include <vector>
 
 #include "environment.h"
-#include "failing_allocation.h"
 #include "scratch_folder.h"
 #include "zarvo.h"
 
@@ -105,48 +102,6 @@ TEST_F(PathMap, CandidatesThatDoNotFitArePassedOver) {
   EXPECT_EQ(map("Old/f", "fit/f"), 1);
   EXPECT_EQ(locate("old/" + name), "none");
   EXPECT_EQ(locate("old/f"), "fit/f");
-}
-
-TEST_F(PathMap, OutOfMemory) {
-  for (const char* const file : {"one/f", "two/f"}) scratch_.make_file(file);
-  const std::string old = at("old/f");
-  const struct {
-    std::string to;
-    int failures;
-    const char* before;
-    const char* after;
-  } cases[] = {{at("one/f"), 3, "none", "one/f"}, {at("two/f"), 1, "one/f", "two/f"}};
-  for (const auto& c : cases) {
-    int result = -1;
-    EXPECT_EQ(fail_each_allocation([&] { result = zv_pathmap(old.c_str(), c.to.c_str()); },
-                                   [&] {
-                                     EXPECT_EQ(result, 0);
-                                     EXPECT_EQ(locate("old/f"), c.before);
-                                   }),
-              c.failures);
-    EXPECT_EQ(result, 1);
-    EXPECT_EQ(locate("old/f"), c.after);
-  }
-}
-
-// Clearing, adding and looking go on at once; what is found is always one of the targets.
-TEST_F(PathMap, EightThreads) {
-  scratch_.make_file("one/f");
-  scratch_.make_file("two/f");
-  const std::string old = at("old/f");
-  const std::string targets[] = {at("one/f"), at("two/f")};
-  const auto work = [&](int thread) {
-    for (int round = 0; round < 100; ++round) {
-      zv_pathmap(old.c_str(), targets[(thread + round) % 2].c_str());
-      zv_pathmap((old + std::to_string(round) + "/x").c_str(), old.c_str());
-      const std::string found = search(zv_pathmap_locate, old);
-      ASSERT_TRUE(found == "none" || found == targets[0] || found == targets[1]) << found;
-      if (round % 10 == thread) zv_pathmap_clear();
-    }
-  };
-  std::vector<std::thread> threads;
-  for (int i = 0; i < 8; ++i) threads.emplace_back(work, i);
-  for (std::thread& thread : threads) thread.join();
 }
 
 }  // namespace

@@ -5,7 +5,6 @@
 #include <vector>
 
 #include "environment.h"
-#include "failing_allocation.h"
 #include "scratch_folder.h"
 #include "zarvo.h"
 
@@ -83,21 +82,6 @@ TEST(SearchPath, Locates) {
   }
   path.set(std::nullopt);
   EXPECT_EQ(locate("tool"), "none");
-}
-
-TEST(SearchPath, OutOfMemory) {
-  const Variable path("PATH", "a;b;c;d;e;f;g;h;i;j");
-  char** list = nullptr;
-  int count = -1;
-  const int met = fail_each_allocation([&] { count = zv_pathlist(&list); },
-                                       [&] {
-                                         EXPECT_EQ(count == 0, list == nullptr);
-                                         zv_strlist_free(list, -1);
-                                         list = nullptr;
-                                       });
-  EXPECT_GE(met, 11);
-  EXPECT_EQ(count, 10);
-  zv_strlist_free(list, count);
 }
 
 }  // namespace

@@ -7,7 +7,6 @@
 #include <fstream>
 #include <random>
 #include <string>
-#include <thread>
 #include <vector>
 
 #include "zarvo.h"
@@ -165,27 +164,6 @@ TEST(Servers, WhatIsNotThere) {
     const int result = zv_copy((set("DIR") + "/file").c_str(), below.c_str());
     EXPECT_EQ(result, place.url.starts_with("http") ? 0 : -4);  // nginx makes the folders
   }
-}
-
-TEST(Servers, TwentyCopiesAtOnce) {
-  const std::vector<Place> all = places();
-  const std::vector<std::string> data = {bytes(100), bytes(70000)};
-  std::vector<std::thread> threads;
-  std::vector<int> results(20, -1);
-  const auto run = [&all, &data, &results](size_t i) {
-    const Place& destination = all[i % all.size()];
-    const std::string name = "at-once-" + std::to_string(i);
-    const fs::path source = all[0].path(name);
-    std::ofstream(source, std::ios::binary) << data[i % 2];
-    const std::string back = set("DIR") + "/back-" + std::to_string(i);
-    const std::string there = destination.location(name + ".there");
-    results[i] = copy(source.string(), there);
-    if (results[i] == 0) results[i] = copy(there, back);
-    if (results[i] == 0 && content(back) != data[i % 2]) results[i] = 1;
-  };
-  for (size_t i = 0; i < results.size(); ++i) threads.emplace_back(run, i);
-  for (std::thread& thread : threads) thread.join();
-  EXPECT_EQ(results, std::vector<int>(20, 0));
 }
 
 }  // namespace

@@ -64,20 +64,6 @@ TEST(Stream, BlocksInTheOtherByteOrder) {
   EXPECT_EQ(zv_fread(back, 4, 1, in.get(), 1), 0u);
 }
 
-TEST(Stream, ShortWriteGivesTheBufferBack) {
-  const Stream full = open("/dev/full", "w");
-  if (!full) GTEST_SKIP() << "no device that is always full";
-  std::string block(1 << 20, 'a');
-  for (size_t i = 0; i < block.size(); ++i) block[i] = static_cast<char>(i);
-  const std::string before = block;
-  EXPECT_LT(zv_fwrite(block.data(), 8, block.size() / 8, full.get(), 1), block.size() / 8);
-  EXPECT_EQ(block, before);
-
-  const std::string lines(1 << 20, '\n');
-  EXPECT_EQ(zv_fputs(lines.c_str(), full.get(), 0), -1);
-  EXPECT_EQ(zv_fputs(lines.c_str(), full.get(), 1), -1);
-}
-
 TEST(Stream, OffsetsBeyondFourGigabytes) {
   const ScratchFolder scratch;
   constexpr int64_t far = INT64_C(5) << 30;

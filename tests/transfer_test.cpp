@@ -2,12 +2,9 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <array>
 #include <filesystem>
 #include <initializer_list>
 #include <string>
-#include <thread>
-#include <vector>
 
 #include "fixtures/scripted_server.h"
 #include "scratch_folder.h"
@@ -76,10 +73,6 @@ TEST(CopyLocal, Failures) {
   EXPECT_EQ(copy(file, "file://"), -4);
   EXPECT_EQ(zv_copy(nullptr, file.c_str()), -3);
   EXPECT_EQ(zv_copy(file.c_str(), nullptr), -4);
-  if (fs::exists("/dev/full")) {
-    EXPECT_EQ(copy(folder.make_file("large", pattern(100000)), "/dev/full"), -4);
-    EXPECT_EQ(copy(file, "/dev/full"), -4);
-  }
   fs::permissions(file, fs::perms::owner_read);
   if (!std::ofstream(file, std::ios::app)) {
     EXPECT_EQ(copy(directory + "/../file", file), -4);
@@ -210,23 +203,6 @@ TEST(HttpGet, RequestsAndBrokenConnections) {
             -3);
 }
 
-TEST(HttpGet, DestinationThatCannotBeWritten) {
-  const SameHandles same;
-  if (!fs::exists("/dev/full")) GTEST_SKIP() << "there is no device that is always full";
-  // Along with the header, behind it, and small enough to be found out only at the close.
-  for (const size_t size : Sizes{5, 500000}) {
-    scripted::Server server([size](scripted::Peer& peer) {
-      peer.receive_until("\r\n\r\n");
-      peer.send("HTTP/1.0 200 OK\r\nContent-Length: " + std::to_string(size) + "\r\n\r\n");
-      try {
-        peer.send(pattern(size));
-      } catch (const std::exception&) {  // the client need not stay for all of it
-      }
-    });
-    EXPECT_EQ(zv_copy(server.url("http", "/f").c_str(), "/dev/full"), -4);
-  }
-}
-
 TEST(HttpPut, RequestAndResponse) {
   const SameHandles same;
   struct Case {
@@ -269,61 +245,6 @@ TEST(HttpPut, ConnectionLostOnTheWay) {
     peer.reset();
   });
   EXPECT_EQ(zv_copy(file.c_str(), server.url("http", "/f").c_str()), -4);
-}
-
-// Blocked in the middle of a send, of a receive, and in between.
-TEST(Http, SignalsDoNotDisturb) {
-  const SameHandles same;
-  const ScratchFolder folder;
-  const std::string content = pattern(8000000);
-  const std::string length = "Content-Length: " + std::to_string(content.size()) + "\r\n\r\n";
-  const std::string file = folder.make_file("f", content);
-  std::string got;
-  scripted::Server put([&](scripted::Peer& peer) {
-    peer.expect("PUT /f HTTP/1.0\r\n" + length);
-    for (std::string piece = "-"; !piece.empty(); got += piece) {
-      scripted::pause(20);
-      piece = peer.receive(std::min<size_t>(1000000, content.size() - got.size()));
-    }
-    scripted::pause(20);
-    peer.send("HTTP/1.0 200 OK\r\n\r\n");
-  });
-  scripted::Server get([&](scripted::Peer& peer) {
-    peer.receive_until("\r\n\r\n");
-    scripted::pause(20);
-    peer.send("HTTP/1.0 200 OK\r\n" + length);
-    peer.send(content.substr(0, 4000000));
-    scripted::pause(50);
-    peer.send(content.substr(4000000));
-  });
-  const scripted::Interruptions interruptions;
-  EXPECT_EQ(zv_copy(file.c_str(), put.url("http", "/f").c_str()), 0);
-  EXPECT_EQ(zv_copy(get.url("http", "/f").c_str(), folder.path("got").c_str()), 0);
-  EXPECT_EQ(put.outcome() + get.outcome(), "");
-  EXPECT_TRUE(got == content);
-  EXPECT_TRUE(folder.content("got") == content);
-}
-
-TEST(Http, CopiesOnSeveralThreads) {
-  const SameHandles same;
-  const ScratchFolder folder;
-  std::vector<std::thread> threads;
-  std::array<int, 4> results;
-  results.fill(-1);
-  for (size_t i = 0; i < results.size(); ++i)
-    threads.emplace_back([&folder, &result = results[i], i] {
-      const std::string body(100000 + i, static_cast<char>('a' + i));
-      scripted::Server server([&body](scripted::Peer& peer) {
-        peer.receive_until("\r\n\r\n");
-        peer.send("HTTP/1.0 200 OK\r\nContent-Length: " + std::to_string(body.size()) + "\r\n\r\n" +
-                  body);
-      });
-      const std::string got = folder.path(std::to_string(i));
-      result = zv_copy(server.url("http", "/f").c_str(), got.c_str());
-      if (folder.content(std::to_string(i)) != body) result = -1;
-    });
-  for (std::thread& thread : threads) thread.join();
-  for (const int result : results) EXPECT_EQ(result, 0);
 }
 
 // The longest texts that a location can hold reach the server whole.

@@ -1,0 +1,193 @@
+// The system's calls that the linker puts others in place of. Linux alone: on Windows the library
+// calls them through its import table, where the linker has no say.
+#include <dirent.h>
+#include <dlfcn.h>
+#include <fcntl.h>
+#include <netdb.h>
+#include <poll.h>
+#include <pwd.h>
+#include <sys/socket.h>
+#include <sys/stat.h>
+#include <sys/xattr.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstdio>
+#include <ctime>
+
+#include "failures/decision.h"
+
+using failing::fails;
+using failing::is_shortened;
+
+namespace {
+
+// What a shortened transfer is asked for: half of it, but not nothing.
+size_t half(size_t size) {
+  return (size + 1) / 2;
+}
+
+// For calls that do what they are for even when they fail.
+int done_but_failed(int result, int error) {
+  errno = error;
+  return result;
+}
+
+// A connection that was reset stays so.
+int lost(int fd) {
+  const int error = errno;
+  if (error == ECONNRESET) shutdown(fd, SHUT_RDWR);
+  return done_but_failed(-1, error);
+}
+
+FILE* broken_stream = nullptr;  // the one that a failing fread() leaves with its error mark
+
+}  // namespace
+
+extern "C" {
+
+// A call that gives `failure` when it is to fail.
+#define ZV_FAILING(result, name, failure, parameters, arguments) \
+  result __real_##name parameters;                               \
+  result __wrap_##name parameters {                              \
+    return fails(#name) ? failure : __real_##name arguments;     \
+  }
+
+ZV_FAILING(int, stat, -1, (const char* path, struct stat* st), (path, st))
+ZV_FAILING(int, lstat, -1, (const char* path, struct stat* st), (path, st))
+ZV_FAILING(int, fstat, -1, (int fd, struct stat* st), (fd, st))
+ZV_FAILING(int, access, -1, (const char* path, int mode), (path, mode))
+ZV_FAILING(int, mkdir, -1, (const char* path, mode_t mode), (path, mode))
+ZV_FAILING(int, rmdir, -1, (const char* path), (path))
+ZV_FAILING(int, remove, -1, (const char* path), (path))
+ZV_FAILING(int, unlinkat, -1, (int fd, const char* path, int flags), (fd, path, flags))
+ZV_FAILING(int, open, -1, (const char* path, int flags, mode_t mode), (path, flags, mode))
+ZV_FAILING(int, openat, -1, (int fd, const char* path, int flags), (fd, path, flags))
+ZV_FAILING(int, ftruncate, -1, (int fd, off_t size), (fd, size))
+ZV_FAILING(char*, getcwd, nullptr, (char* room, size_t size), (room, size))
+ZV_FAILING(char*, mkdtemp, nullptr, (char* name), (name))
+ZV_FAILING(struct dirent*, readdir, nullptr, (DIR * stream), (stream))
+ZV_FAILING(ssize_t, getxattr, -1, (const char* path, const char* name, void* value, size_t size),
+           (path, name, value, size))
+ZV_FAILING(int, setxattr, -1,
+           (const char* path, const char* name, const void* value, size_t size, int flags),
+           (path, name, value, size, flags))
+ZV_FAILING(int, removexattr, -1, (const char* path, const char* name), (path, name))
+ZV_FAILING(void*, dlsym, nullptr, (void* library, const char* name), (library, name))
+ZV_FAILING(struct tm*, localtime_r, nullptr, (const time_t* time, struct tm* out), (time, out))
+ZV_FAILING(int, getpwuid_r, errno,
+           (uid_t user, struct passwd* out, char* room, size_t size, struct passwd** found),
+           (user, out, room, size, found))
+ZV_FAILING(int, gethostname, -1, (char* room, size_t size), (room, size))
+ZV_FAILING(int, socket, -1, (int domain, int type, int protocol), (domain, type, protocol))
+ZV_FAILING(int, setsockopt, -1, (int fd, int level, int name, const void* value, socklen_t size),
+           (fd, level, name, value, size))
+ZV_FAILING(int, getsockopt, -1, (int fd, int level, int name, void* value, socklen_t* size),
+           (fd, level, name, value, size))
+ZV_FAILING(int, poll, -1, (struct pollfd * fds, nfds_t count, int timeout), (fds, count, timeout))
+ZV_FAILING(int, fflush, EOF, (FILE * stream), (stream))
+ZV_FAILING(int, fseeko, -1, (FILE * stream, off_t offset, int origin), (stream, offset, origin))
+ZV_FAILING(off_t, ftello, -1, (FILE * stream), (stream))
+
+#undef ZV_FAILING
+// The same for what needs memory.
+#define ZV_NEEDING_MEMORY(result, name, failure, parameters, arguments) \
+  result __real_##name parameters;                                      \
+  result __wrap_##name parameters {                                     \
+    return fails(#name, true) ? failure : __real_##name arguments;      \
+  }
+
+ZV_NEEDING_MEMORY(FILE*, fdopen, nullptr, (int fd, const char* mode), (fd, mode))
+ZV_NEEDING_MEMORY(DIR*, opendir, nullptr, (const char* path), (path))
+ZV_NEEDING_MEMORY(DIR*, fdopendir, nullptr, (int fd), (fd))
+ZV_NEEDING_MEMORY(void*, dlopen, nullptr, (const char* path, int flags), (path, flags))
+ZV_NEEDING_MEMORY(int, getaddrinfo, EAI_MEMORY,
+                  (const char* host, const char* service, const addrinfo* hints, addrinfo** list),
+                  (host, service, hints, list))
+
+#undef ZV_NEEDING_MEMORY
+
+int __real_close(int fd);
+int __wrap_close(int fd) {
+  const bool failed = fails("close");
+  const int error = errno;
+  const int result = __real_close(fd);
+  return failed ? done_but_failed(-1, error) : result;
+}
+
+int __real_closedir(DIR* stream);
+int __wrap_closedir(DIR* stream) {
+  const bool failed = fails("closedir");
+  const int error = errno;
+  const int result = __real_closedir(stream);
+  return failed ? done_but_failed(-1, error) : result;
+}
+
+int __real_fclose(FILE* stream);
+int __wrap_fclose(FILE* stream) {
+  if (stream == broken_stream) broken_stream = nullptr;
+  const bool failed = fails("fclose");
+  const int error = errno;
+  const int result = __real_fclose(stream);
+  return failed ? done_but_failed(EOF, error) : result;
+}
+
+// A connect that a signal interrupts goes on by itself, as this one does before it is told. A wait
+// for it only happens then.
+int __real_connect(int fd, const struct sockaddr* address, socklen_t size);
+int __wrap_connect(int fd, const struct sockaddr* address, socklen_t size) {
+  const bool failed = fails("connect");
+  if (failed && errno != EINTR) return -1;
+  const int result = __real_connect(fd, address, size);
+  return failed || failing::is_tested("poll") ? done_but_failed(-1, EINTR) : result;
+}
+
+ssize_t __real_send(int fd, const void* data, size_t size, int flags);
+ssize_t __wrap_send(int fd, const void* data, size_t size, int flags) {
+  const bool failed = fails("send");
+  if (failed && !is_shortened()) return lost(fd);
+  return __real_send(fd, data, failed ? half(size) : size, flags);
+}
+
+ssize_t __real_recv(int fd, void* room, size_t size, int flags);
+ssize_t __wrap_recv(int fd, void* room, size_t size, int flags) {
+  const bool failed = fails("recv");
+  if (failed && !is_shortened()) return lost(fd);
+  return __real_recv(fd, room, failed ? 1 : size, flags);
+}
+
+ssize_t __real_pread(int fd, void* room, size_t size, off_t offset);
+ssize_t __wrap_pread(int fd, void* room, size_t size, off_t offset) {
+  const bool failed = fails("pread");
+  if (failed && !is_shortened()) return -1;
+  return __real_pread(fd, room, failed ? half(size) : size, offset);
+}
+
+ssize_t __real_copy_file_range(int in, off_t* from, int out, off_t* to, size_t size,
+                               unsigned flags);
+ssize_t __wrap_copy_file_range(int in, off_t* from, int out, off_t* to, size_t size,
+                               unsigned flags) {
+  const bool failed = fails("copy_file_range");
+  if (failed && !is_shortened()) return -1;
+  return __real_copy_file_range(in, from, out, to, failed ? 1000 : size, flags);
+}
+
+// Streams move half before they fail.
+size_t __real_fread(void* room, size_t size, size_t count, FILE* stream);
+size_t __wrap_fread(void* room, size_t size, size_t count, FILE* stream) {
+  if (!fails("fread")) return __real_fread(room, size, count, stream);
+  broken_stream = stream;
+  return __real_fread(room, size, count / 2, stream);
+}
+
+int __real_ferror(FILE* stream);
+int __wrap_ferror(FILE* stream) {
+  return stream == broken_stream || __real_ferror(stream) != 0;
+}
+
+size_t __real_fwrite(const void* data, size_t size, size_t count, FILE* stream);
+size_t __wrap_fwrite(const void* data, size_t size, size_t count, FILE* stream) {
+  const bool failed = count != 0 && fails("fwrite");
+  return __real_fwrite(data, size, failed ? count / 2 : count, stream);
+}
+}
