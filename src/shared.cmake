@@ -1,4 +1,4 @@
-# The shared library: what it exports and how it is hardened.
+# The shared library: what it exports, and what it is linked with.
 include(${PROJECT_SOURCE_DIR}/cmake/exports.cmake)
 zarvo_write_exports(${PROJECT_SOURCE_DIR}/include/zarvo.h
                     ${CMAKE_CURRENT_BINARY_DIR}/zarvo.map ${CMAKE_CURRENT_BINARY_DIR}/zarvo.def)
@@ -8,6 +8,7 @@ set_target_properties(zarvo PROPERTIES
   VERSION ${PROJECT_VERSION}
   SOVERSION ${PROJECT_VERSION_MAJOR}
   LINKER_LANGUAGE C)
+target_link_libraries(zarvo PRIVATE zarvo_hardening)
 
 if(WIN32)
   set_target_properties(zarvo PROPERTIES PREFIX "" IMPORT_PREFIX "lib" DLL_NAME_WITH_SOVERSION OFF)
@@ -15,8 +16,7 @@ if(WIN32)
   configure_file(version.rc.in version.rc @ONLY)
   target_sources(zarvo PRIVATE ${CMAKE_CURRENT_BINARY_DIR}/zarvo.def
                                ${CMAKE_CURRENT_BINARY_DIR}/version.rc)
-  target_link_libraries(zarvo PRIVATE ws2_32 advapi32 pthread ssp)
-  target_link_options(zarvo PRIVATE -Wl,--high-entropy-va,--dynamicbase,--nxcompat)
+  target_link_libraries(zarvo PRIVATE ws2_32 advapi32 pthread)
   # libzarvo.dll.a comes from the linker; other compilers' import library, zarvo.lib, from LLVM.
   find_program(ZARVO_DLLTOOL NAMES llvm-dlltool llvm-dlltool-14 NO_CMAKE_FIND_ROOT_PATH)
   if(ZARVO_DLLTOOL)
@@ -28,8 +28,7 @@ if(WIN32)
 else()
   target_link_libraries(zarvo PRIVATE ${CMAKE_DL_LIBS})
   target_link_options(zarvo PRIVATE
-    -Wl,--version-script,${CMAKE_CURRENT_BINARY_DIR}/zarvo.map
-    -Wl,-z,relro,-z,now,-z,noexecstack)
+    -Wl,--version-script,${CMAKE_CURRENT_BINARY_DIR}/zarvo.map)
   if(NOT ZARVO_SANITIZE)
     target_link_options(zarvo PRIVATE -Wl,-z,defs)
   endif()
