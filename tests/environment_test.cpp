@@ -1,23 +1,11 @@
 // The private environment.
 #include <gtest/gtest.h>
 
-#include <cstring>
 #include <string>
 
-#include "zarvo.h"
+#include "fixtures/private_values.h"
 
 namespace {
-
-// The values of a variable, '|' behind each; "none" when it is not there.
-std::string get(const char* name) {
-  char* const block = zv_getenv_private(name);
-  if (block == nullptr) return "none";
-  std::string values;
-  for (const char* value = block; *value != '\0'; value += std::strlen(value) + 1)
-    values += std::string(value) + '|';
-  zv_free(block);
-  return values;
-}
 
 class Environment : public testing::Test {
  protected:
@@ -26,7 +14,7 @@ class Environment : public testing::Test {
 };
 
 TEST_F(Environment, PutAndGet) {
-  EXPECT_EQ(get("A"), "none");
+  EXPECT_EQ(private_values("A"), "none");
   const struct {
     const char* name;
     const char* value;
@@ -45,11 +33,11 @@ TEST_F(Environment, PutAndGet) {
   for (const auto& step : steps) {
     SCOPED_TRACE(std::string(step.name) + "=" + (step.value != nullptr ? step.value : "(none)"));
     EXPECT_EQ(zv_putenv_private(step.name, step.value, step.append), step.result);
-    EXPECT_EQ(get(step.name), step.values);
+    EXPECT_EQ(private_values(step.name), step.values);
   }
-  EXPECT_EQ(get(""), "empty name|");
+  EXPECT_EQ(private_values(""), "empty name|");
   EXPECT_EQ(zv_putenv_private(nullptr, "ignored\x1E", 1), 1);
-  EXPECT_EQ(get("A"), "none");
+  EXPECT_EQ(private_values("A"), "none");
 }
 
 TEST_F(Environment, EmptyValuesAreKept) {
@@ -73,7 +61,7 @@ TEST_F(Environment, ManyVariables) {
     const std::string expected[] = {"none", name(i) + "|more|", name(i) + "|"};
     std::string other_case = name(i);
     zv_strupr(other_case.data());
-    ASSERT_EQ(get(other_case.c_str()), expected[i % 3]);
+    ASSERT_EQ(private_values(other_case.c_str()), expected[i % 3]);
   }
 }
 

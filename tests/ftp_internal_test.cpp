@@ -131,14 +131,4 @@ TEST(Ftp, PathsInCommands) {
   }
 }
 
-TEST(Ftp, LocalSideFails) {
-  const ScratchFolder folder;
-  const std::string closed = "ftp://127.0.0.1:" + std::to_string(closed_port()) + "/f";
-  EXPECT_EQ(zv_copy(closed.c_str(), folder.path("missing/new").c_str()), -4);
-  EXPECT_EQ(zv_copy(folder.path("missing").c_str(), closed.c_str()), -3);
-  EXPECT_EQ(zv_copy(folder.path().c_str(), closed.c_str()), -3);
-  EXPECT_EQ(zv_copy(closed.c_str(), folder.path("new").c_str()), -3);
-  EXPECT_TRUE(folder.exists("new"));
-}
-
 }  // namespace

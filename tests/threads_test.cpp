@@ -13,6 +13,7 @@
 #include "environment.h"
 #include "fixtures/dialogues.h"
 #include "fixtures/plugins/plugin_folder.h"
+#include "fixtures/private_values.h"
 #include "zarvo.h"
 
 namespace {
@@ -30,16 +31,6 @@ void on_threads(int count, Work work) {
   for (std::thread& thread : threads) thread.join();
 }
 
-std::string variable(const std::string& name) {
-  char* const block = zv_getenv_private(name.c_str());
-  std::string values = block == nullptr ? "none" : "";
-  for (const char* value = block; value != nullptr && *value != '\0';
-       value += std::strlen(value) + 1)
-    values += std::string(value) + '|';
-  zv_free(block);
-  return values;
-}
-
 // Each thread sees its own variable as it left it, and the shared one whole.
 TEST(Threads, PrivateEnvironment) {
   on_threads(8, [](int thread) {
@@ -51,8 +42,8 @@ TEST(Threads, PrivateEnvironment) {
       zv_putenv_private((own + value).c_str(), "made", 0);
       if (round > 10) zv_putenv_private((own + std::to_string(round - 10)).c_str(), nullptr, 0);
       zv_putenv_private(own.c_str(), "last", 1);
-      ASSERT_EQ(variable(own), value + "|last|");
-      const std::string shared = variable("shared");
+      ASSERT_EQ(private_values(own), value + "|last|");
+      const std::string shared = private_values("shared");
       ASSERT_EQ(shared.substr(0, 3), "own");
       ASSERT_EQ(shared.size() % 5, 0u);
     }

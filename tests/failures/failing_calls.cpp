@@ -8,8 +8,6 @@
 #include <cerrno>
 #include <cstdio>
 
-#include "failures/decision.h"
-
 #ifdef _WIN32
 #include <windows.h>
 #else

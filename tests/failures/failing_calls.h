@@ -65,6 +65,17 @@ int walk(const Fault& fault, Row row) {
   }
 }
 
+// ---- What the functions in place of others ask ----
+
+// Whether the call fails now; errno is set then.
+bool fails(std::string_view call, bool needs_memory = false);
+
+// Whether the call is the one that this attempt is about.
+bool is_tested(std::string_view call);
+
+// Whether a call that fails now only moves fewer bytes.
+bool is_shortened();
+
 }  // namespace failing
 
 #endif

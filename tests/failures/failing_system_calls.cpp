@@ -15,7 +15,7 @@
 #include <cstdio>
 #include <ctime>
 
-#include "failures/decision.h"
+#include "failures/failing_calls.h"
 
 using failing::fails;
 using failing::is_shortened;
@@ -40,17 +40,28 @@ int lost(int fd) {
   return done_but_failed(-1, error);
 }
 
-FILE* broken_stream = nullptr;  // the one that a failing fread() leaves with its error mark
+FILE* broken_stream = nullptr;  // what a failing fread() leaves with its error mark
 
 }  // namespace
 
 extern "C" {
 
 // A call that gives `failure` when it is to fail.
-#define ZV_FAILING(result, name, failure, parameters, arguments) \
-  result __real_##name parameters;                               \
-  result __wrap_##name parameters {                              \
-    return fails(#name) ? failure : __real_##name arguments;     \
+#define ZV_FAILING_CALL(result, name, needs_memory, failure, parameters, arguments) \
+  result __real_##name parameters;                                                  \
+  result __wrap_##name parameters {                                                 \
+    return fails(#name, needs_memory) ? failure : __real_##name arguments;          \
+  }
+#define ZV_FAILING(result, name, ...) ZV_FAILING_CALL(result, name, false, __VA_ARGS__)
+#define ZV_NEEDING_MEMORY(result, name, ...) ZV_FAILING_CALL(result, name, true, __VA_ARGS__)
+// A call that does what it is for even when it fails.
+#define ZV_FAILING_BEHIND(name, failure, argument)            \
+  int __real_##name(argument);                                \
+  int __wrap_##name(argument it) {                            \
+    const bool failed = fails(#name);                         \
+    const int error = errno;                                  \
+    const int result = __real_##name(it);                     \
+    return failed ? done_but_failed(failure, error) : result; \
   }
 
 ZV_FAILING(int, stat, -1, (const char* path, struct stat* st), (path, st))
@@ -89,14 +100,6 @@ ZV_FAILING(int, fflush, EOF, (FILE * stream), (stream))
 ZV_FAILING(int, fseeko, -1, (FILE * stream, off_t offset, int origin), (stream, offset, origin))
 ZV_FAILING(off_t, ftello, -1, (FILE * stream), (stream))
 
-#undef ZV_FAILING
-// The same for what needs memory.
-#define ZV_NEEDING_MEMORY(result, name, failure, parameters, arguments) \
-  result __real_##name parameters;                                      \
-  result __wrap_##name parameters {                                     \
-    return fails(#name, true) ? failure : __real_##name arguments;      \
-  }
-
 ZV_NEEDING_MEMORY(FILE*, fdopen, nullptr, (int fd, const char* mode), (fd, mode))
 ZV_NEEDING_MEMORY(DIR*, opendir, nullptr, (const char* path), (path))
 ZV_NEEDING_MEMORY(DIR*, fdopendir, nullptr, (int fd), (fd))
@@ -105,32 +108,9 @@ ZV_NEEDING_MEMORY(int, getaddrinfo, EAI_MEMORY,
                   (const char* host, const char* service, const addrinfo* hints, addrinfo** list),
                   (host, service, hints, list))
 
-#undef ZV_NEEDING_MEMORY
-
-int __real_close(int fd);
-int __wrap_close(int fd) {
-  const bool failed = fails("close");
-  const int error = errno;
-  const int result = __real_close(fd);
-  return failed ? done_but_failed(-1, error) : result;
-}
-
-int __real_closedir(DIR* stream);
-int __wrap_closedir(DIR* stream) {
-  const bool failed = fails("closedir");
-  const int error = errno;
-  const int result = __real_closedir(stream);
-  return failed ? done_but_failed(-1, error) : result;
-}
-
-int __real_fclose(FILE* stream);
-int __wrap_fclose(FILE* stream) {
-  if (stream == broken_stream) broken_stream = nullptr;
-  const bool failed = fails("fclose");
-  const int error = errno;
-  const int result = __real_fclose(stream);
-  return failed ? done_but_failed(EOF, error) : result;
-}
+ZV_FAILING_BEHIND(close, -1, int)
+ZV_FAILING_BEHIND(closedir, -1, DIR*)
+ZV_FAILING_BEHIND(fclose, EOF, FILE*)
 
 // A connect that a signal interrupts goes on by itself, as this one does before it is told. A wait
 // for it only happens then.
@@ -175,9 +155,9 @@ ssize_t __wrap_copy_file_range(int in, off_t* from, int out, off_t* to, size_t s
 // Streams move half before they fail.
 size_t __real_fread(void* room, size_t size, size_t count, FILE* stream);
 size_t __wrap_fread(void* room, size_t size, size_t count, FILE* stream) {
-  if (!fails("fread")) return __real_fread(room, size, count, stream);
-  broken_stream = stream;
-  return __real_fread(room, size, count / 2, stream);
+  const bool failed = fails("fread");
+  broken_stream = failed ? stream : nullptr;
+  return __real_fread(room, size, failed ? count / 2 : count, stream);
 }
 
 int __real_ferror(FILE* stream);

@@ -1,10 +1,9 @@
 // Every exported function that allocates, with each allocation failing in turn: the documented
 // result, nothing lost, and what was there before as documented.
-#include <cstring>
-
 #include "environment.h"
 #include "failures/operations.h"
 #include "fixtures/plugins/plugin_folder.h"
+#include "fixtures/private_values.h"
 #include "zarvo.h"
 
 namespace {
@@ -51,12 +50,12 @@ int new_list(Attempt& attempt) {
 
 // A change of the list "a|b|", and what a success makes of it.
 template <class Change>
-Operation list_change(const char* name, Change change, const char* after, int good = 1) {
-  return {name, good, [=](Attempt& attempt) {
+Operation list_change(const char* name, const char* after, Change change) {
+  return {name, 1, [=](Attempt& attempt) {
             char** list = nullptr;
             zv_strlist(&list, "a;b;", ';');
             const int result = attempt([&] { return change(&list); });
-            EXPECT_EQ(texts(list), result == good ? after : "a|b|");
+            EXPECT_EQ(texts(list), result == 1 ? after : "a|b|");
             zv_strlist_free(list, -1);
             return result;
           }};
@@ -88,16 +87,6 @@ int list_as_set(Attempt& attempt) {
 
 // ---- Private environment, path map, search path, the user ---------------------------------------
 
-std::string values(const char* name) {
-  char* const block = zv_getenv_private(name);
-  std::string all = block == nullptr ? "none" : "";
-  for (const char* value = block; value != nullptr && *value != '\0';
-       value += std::strlen(value) + 1)
-    all += std::string(value) + '|';
-  zv_free(block);
-  return all;
-}
-
 // With as many variables as there are buckets, so that one more also asks for more of those.
 Operation put(const char* name, const std::string& value, int append, const char* before,
               const std::string& after) {
@@ -105,8 +94,8 @@ Operation put(const char* name, const std::string& value, int append, const char
             for (int i = 0; i < 16; ++i) zv_putenv_private(std::to_string(i).c_str(), "kept", 0);
             const int result =
                 attempt([&] { return zv_putenv_private(name, value.c_str(), append); });
-            EXPECT_EQ(values(name), result == 1 ? after : before);
-            EXPECT_EQ(values("8"), "kept|");
+            EXPECT_EQ(private_values(name), result == 1 ? after : before);
+            EXPECT_EQ(private_values("8"), "kept|");
             zv_putenv_private(nullptr, nullptr, 0);
             return result;
           }};
@@ -114,7 +103,7 @@ Operation put(const char* name, const std::string& value, int append, const char
 
 int first_variable(Attempt& attempt) {
   const int result = attempt([] { return zv_putenv_private("A", "v", 0); });
-  EXPECT_EQ(values("A"), result == 1 ? "v|" : "none");
+  EXPECT_EQ(private_values("A"), result == 1 ? "v|" : "none");
   zv_putenv_private(nullptr, nullptr, 0);
   return result;
 }
@@ -124,7 +113,7 @@ int variable_got(Attempt& attempt) {
   char* const value = attempt([] { return zv_getenv_private("A"); });
   const bool got = value != nullptr;
   zv_free(value);
-  EXPECT_EQ(values("A"), "v|");
+  EXPECT_EQ(private_values("A"), "v|");
   zv_putenv_private(nullptr, nullptr, 0);
   return got;
 }
@@ -245,52 +234,51 @@ int composite_format(Attempt& attempt) {
   return result;
 }
 
+Row row(const Operation& operation, std::vector<int> results, bool in_any_order = false) {
+  return {operation, std::string(all_memory), ENOMEM, std::move(results), in_any_order};
+}
+
 std::vector<Row> rows() {
-  constexpr Fault no_memory = {all_memory, ENOMEM};
   const std::string large(100, 'v');
   std::vector<Row> all = {
-      {{"zv_malloc, zv_calloc, zv_dalloc", 3, new_blocks}, no_memory, {2}},
-      {{"zv_realloc", 1, resized_block}, no_memory, {0}},
-      {{"zv_strlist", 2, new_list}, no_memory, {-1}},
-      {list_change(
-           "zv_strlist_insert", [](char*** l) { return zv_strlist_insert(l, -1, 0, "x"); },
-           "x|a|b|"),
-       no_memory,
-       {0}},
-      {list_change(
-           "zv_strlist_replace", [](char*** l) { return zv_strlist_replace(*l, 0, "x"); }, "x|b|"),
-       no_memory,
-       {0}},
-      {list_change(
-           "zv_strlist_reduce", [](char*** l) { return zv_strlist_reduce(l, -1, 1); }, "b|"),
-       no_memory,
-       {1}},
-      {{"zv_strlist_cat", 2, concatenated_list}, no_memory, {-1}},
-      {{"zv_strlist_set, zv_strlist_iset", 200, list_as_set}, no_memory, {200}},
-      {put("7", large, 1, "kept|", "kept|" + large + "|"), no_memory, {0}},
-      {put("7", "anew", 0, "none", "anew|"), no_memory, {0}},
-      {put("new", "v", 0, "none", "v|"), no_memory, {1, 0}},  // it does with the buckets there are
-      {put("new", "w", 1, "none", "w|"), no_memory, {1, 0}},
-      {{"the first zv_putenv_private", 1, first_variable}, no_memory, {0}},
-      {{"zv_getenv_private", 1, variable_got}, no_memory, {0}},
-      {map_folder(true), no_memory, {0}},
-      {map_folder(false), no_memory, {0}},
-      {{"zv_pathlist", 10, search_folders}, no_memory, {0, 10}, true},  // 10: it was only not cut
-      {{"zv_plugin_create", 1, new_record}, no_memory, {0}},
-      {{"zv_plugin_add_lib", 1, added_library}, no_memory, {0}},
-      {{"zv_plugin_enumerate", 2, enumeration}, no_memory, {0, 1, 2}, true},
-      {{"zv_plugin_formats", 3, collected_formats}, no_memory, {0, 3}, true},
-      {{"zv_fmt_composite", 1, composite_format}, no_memory, {0}},
-      {make_file, no_memory, {0}},
-      {open_file, no_memory, {0}},
-      {read_folder, no_memory, {0}},
-      {scan_tree, no_memory, {-1, 0, 1, 2, 3, 4, 5}, true},
-      {remove_tree, no_memory, {0}},
-      {copy_file, no_memory, {-3, -3, -4}},
-      {copy_between_servers, no_memory, {-4, -4, -3}},
+      row({"zv_malloc, zv_calloc, zv_dalloc", 3, new_blocks}, {2}),
+      row({"zv_realloc", 1, resized_block}, {0}),
+      row({"zv_strlist", 2, new_list}, {-1}),
+      row(list_change("zv_strlist_insert", "x|a|b|",
+                      [](char*** l) { return zv_strlist_insert(l, -1, 0, "x"); }),
+          {0}),
+      row(list_change("zv_strlist_replace", "x|b|",
+                      [](char*** l) { return zv_strlist_replace(*l, 0, "x"); }),
+          {0}),
+      row(list_change("zv_strlist_reduce", "b|",
+                      [](char*** l) { return zv_strlist_reduce(l, -1, 1); }),
+          {1}),
+      row({"zv_strlist_cat", 2, concatenated_list}, {-1}),
+      row({"zv_strlist_set, zv_strlist_iset", 200, list_as_set}, {200}),
+      row(put("7", large, 1, "kept|", "kept|" + large + "|"), {0}),
+      row(put("7", "anew", 0, "none", "anew|"), {0}),
+      row(put("new", "v", 0, "none", "v|"), {1, 0}),  // it does with the buckets there are
+      row(put("new", "w", 1, "none", "w|"), {1, 0}),
+      row({"the first zv_putenv_private", 1, first_variable}, {0}),
+      row({"zv_getenv_private", 1, variable_got}, {0}),
+      row(map_folder(true), {0}),
+      row(map_folder(false), {0}),
+      row({"zv_pathlist", 10, search_folders}, {0, 10}, true),  // 10: it was only not cut
+      row({"zv_plugin_create", 1, new_record}, {0}),
+      row({"zv_plugin_add_lib", 1, added_library}, {0}),
+      row({"zv_plugin_enumerate", 2, enumeration}, {0, 1, 2}, true),
+      row({"zv_plugin_formats", 3, collected_formats}, {0, 3}, true),
+      row({"zv_fmt_composite", 1, composite_format}, {0}),
+      row(make_file, {0}),
+      row(open_file, {0}),
+      row(read_folder, {0}),
+      row(scan_tree, {-1, 0, 1, 2, 3, 4, 5}, true),
+      row(remove_tree, {0}),
+      row(copy_file, {-3, -3, -4}),
+      row(copy_between_servers, {-4, -4, -3}),
   };
   for (const scripted::Dialogue& dialogue : scripted::dialogues())
-    all.push_back({copy_along(dialogue), no_memory, {dialogue.local_failed()}});
+    all.push_back(row(copy_along(dialogue), {dialogue.local_failed()}));
   return all;
 }
 
@@ -306,7 +294,7 @@ TEST(OutOfMemory, TheFirstLock) {
   }
   char path[ZV_PATH_MAX] = "/a/f";
   EXPECT_EQ(zv_pathmap_locate(path), 0);
-  EXPECT_EQ(values("A"), "none");
+  EXPECT_EQ(private_values("A"), "none");
 }
 
 TEST(OutOfMemory, EveryAllocationOfEveryFunction) {

@@ -1,7 +1,9 @@
 #include "failures/operations.h"
 
 #include <algorithm>
+#include <cstdio>
 #include <filesystem>
+#include <sstream>
 
 #include "environment.h"
 #include "zarvo.h"
@@ -120,7 +122,36 @@ int relayed(Attempt& attempt) {
   return result;
 }
 
+bool allows(const Row& row, size_t failure, int result) {
+  if (row.in_any_order)
+    return std::find(row.results.begin(), row.results.end(), result) != row.results.end();
+  return result == row.results.at(std::min(failure, row.results.size() - 1));
+}
+
+int walk_row(const Row& row, const std::string& call) {
+  SCOPED_TRACE(row.operation.name);
+  size_t failure = 0;
+  const int met = walk({call, row.error}, [&](Attempt& attempt) {
+    const int result = row.operation.run(attempt);
+    const bool expected =
+        attempt.failed().empty() ? result == row.operation.good : allows(row, failure++, result);
+    EXPECT_TRUE(expected) << attempt.failed() << " gave " << result;
+  });
+  EXPECT_GT(met, 0) << call << " was never called";
+  return met;
+}
+
 }  // namespace
+
+void walk_all(const char* what, const std::vector<Row>& rows) {
+  int pairs = 0;
+  int points = 0;
+  for (const Row& row : rows) {
+    std::istringstream calls(row.calls);
+    for (std::string call; calls >> call; ++pairs) points += walk_row(row, call);
+  }
+  std::printf("%s: %d points under %d operations and calls\n", what, points, pairs);
+}
 
 const Operation make_file = {"zv_mkfile", 1, file_made};
 const Operation open_file = {"zv_fopen", 1, file_opened};

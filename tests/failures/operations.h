@@ -1,11 +1,35 @@
-// Operations on files and servers, for the tables of failing calls.
+// Tables of operations and the calls that fail under them; and operations on files and servers.
 #ifndef ZARVO_TESTS_FAILURE_OPERATIONS_H
 #define ZARVO_TESTS_FAILURE_OPERATIONS_H
 
-#include "failures/table.h"
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "failures/failing_calls.h"
 #include "fixtures/dialogues.h"
 
 namespace failing {
+
+// Something that the library does. `run` also looks at what a failure left, beside the result.
+struct Operation {
+  std::string name;
+  int good;  // the result when nothing fails
+  std::function<int(Attempt&)> run;
+};
+
+struct Row {
+  Operation operation;
+  std::string calls;  // one or more, each walked by itself
+  int error;          // as of a Fault
+  // What comes of it when the first call fails, the second, and so on; the last one stands for all
+  // that follow.
+  std::vector<int> results;
+  bool in_any_order = false;
+};
+
+// Walks every row and prints how many points that made: each is an operation and its Nth call.
+void walk_all(const char* what, const std::vector<Row>& rows);
 
 extern const Operation make_file;             // zv_mkfile() two folders deep
 extern const Operation open_file;             // zv_fopen()

@@ -140,123 +140,76 @@ const Operation locate_file = {"zv_path_locate", 1, file_located};
 
 std::vector<Row> local_rows() {
   return {
-      {copy_file, {"fopen", EACCES}, {-3}},
-      {copy_file, {"fread", EIO}, {-3}},
-      {copy_file, {"open", ENOSPC}, {-4}},
-      {copy_file, {"open", EINTR}, {-4}},
-      {copy_file, {"fdopen", ENOMEM}, {-4}},
-      {copy_file, {"fstat", EIO}, {-4}},
-      {copy_file, {"ftruncate", EIO}, {-4}},
-      {copy_file, {"fwrite", ENOSPC}, {-4}},
-      {copy_file, {"fflush", ENOSPC}, {-4}},
-      {copy_file, {"fseeko", EIO}, {-4}},
-      {copy_file, {"fclose", ENOSPC}, {-4, 0}},  // the destination, then the source
+      {copy_file, "fopen fread", EIO, {-3}},
+      {copy_file, "open fdopen fstat ftruncate fwrite fflush fseeko", ENOSPC, {-4}},
+      {copy_file, "open fwrite", EINTR, {-4}},
+      {copy_file, "fclose", ENOSPC, {-4, 0}},  // the destination, then the source
       // What the system does not move by itself is copied block by block.
-      {copy_file, {"ftello", ESPIPE}, {0}},
-      {copy_file, {"copy_file_range", EINTR}, {0}},
-      {copy_file, {"copy_file_range", EXDEV}, {0}},
-      {copy_file, {"copy_file_range", shortened}, {0}},
-      {copy_onto_itself, {"fstat", EIO}, {-4}},
+      {copy_file, "ftello copy_file_range", EINTR, {0}},
+      {copy_file, "copy_file_range", EXDEV, {0}},
+      {copy_file, "copy_file_range", shortened, {0}},
+      {copy_onto_itself, "fstat", EIO, {-4}},
 
-      {make_path, {"mkdir", ENOSPC}, {0}},
-      {make_path, {"stat", EIO}, {1}},  // the making tells what the looking did not
-      {make_file, {"fopen", EROFS}, {0}},
-      {make_file, {"fclose", EIO}, {1}},  // nothing was written
-      {ask_path, {"stat", EACCES}, {0}},
-      {ask_path, {"access", EROFS}, {0}},
-      {locate_file, {"stat", EACCES}, {1}},
-      {open_library, {"open", EMFILE}, {0}},
-      {open_library, {"fstat", EIO}, {0}},
-      {open_library, {"pread", EIO}, {0}},
-      {open_library, {"pread", shortened}, {0}},
-      {open_library, {"dlopen", ENOEXEC}, {0}},
-      {open_library, {"dlsym", ENOENT}, {0}},
-      {open_library, {"close", EIO}, {1}},
-      {ask_host, {"getpwuid_r", EIO}, {0}},
-      {ask_host, {"gethostname", EPERM}, {0}},
-      {ask_host, {"getcwd", ENOENT}, {0}},
-      {ask_home, {"getpwuid_r", EIO}, {0}},
-      {ask_home, {"getpwuid_r", ERANGE}, {1}},
-      {open_library, {all_memory, ENOMEM}, {0}},
-      {use_stream, {"fwrite", ENOSPC}, {0}},
-      {use_stream, {"fseeko", EINVAL}, {0}},
-      {use_stream, {"ftello", EBADF}, {0}},
-      {use_stream, {"fread", EIO}, {0}},
+      {make_path, "mkdir", ENOSPC, {0}},
+      {make_path, "stat", EIO, {1}},  // the making tells what the looking did not
+      {make_file, "fopen", EROFS, {0}},
+      {make_file, "fclose", EIO, {1}},  // nothing was written
+      {ask_path, "stat access", EACCES, {0}},
+      {locate_file, "stat", EACCES, {1}},
+      {open_library, "open fstat pread dlopen dlsym", EIO, {0}},
+      {open_library, "pread", shortened, {0}},
+      {open_library, "dlopen", ENOMEM, {0}},
+      {open_library, "close", EIO, {1}},
+      {ask_host, "getpwuid_r gethostname getcwd", EIO, {0}},
+      {ask_home, "getpwuid_r", EIO, {0}},
+      {ask_home, "getpwuid_r", ERANGE, {1}},
+      {use_stream, "fwrite fseeko ftello fread", ENOSPC, {0}},
 
-      {read_folder, {"opendir", EMFILE}, {0}},
-      {read_folder, {"readdir", EIO}, {0, 1, 2, 3}},
-      {read_folder, {"closedir", EIO}, {3}},
-      {scan_tree, {"opendir", EACCES}, {0}},
+      {read_folder, "opendir", EMFILE, {0}},
+      {read_folder, "readdir", EIO, {0, 1, 2, 3}},
+      {read_folder, "closedir", EIO, {3}},
+      {scan_tree, "opendir", EACCES, {0}},
       // A folder that cannot be opened has no entries, and a search that fails is at its end.
-      {scan_tree, {"openat", EMFILE}, {1, 2, 3, 4}, true},
-      {scan_tree, {"fdopendir", ENOMEM}, {1, 2, 3, 4}, true},
-      {scan_tree, {"readdir", EIO}, {0, 1, 2, 3, 4, 5}, true},
-      {scan_tree, {"closedir", EIO}, {5}},
-      {remove_tree, {"open", EMFILE}, {0}},
-      {remove_tree, {"openat", EMFILE}, {0}},
-      {remove_tree, {"opendir", ENFILE}, {0}},
-      {remove_tree, {"unlinkat", EACCES}, {0}},
-      {remove_tree, {"rmdir", EBUSY}, {0}},
-      {remove_tree, {"close", EIO}, {1}},
-      {remove_tree, {"closedir", EIO}, {1}},
-  };
-}
-
-std::vector<Row> attribute_rows() {
-  return {
-      {hide_file, {"getxattr", EIO}, {0}},
-      {hide_file, {"setxattr", ENOSPC}, {0}},
-      {hide_file, {"removexattr", EIO}, {0}},
-      {hide_file, {"stat", EIO}, {0}},
+      {scan_tree, "openat fdopendir", EMFILE, {1, 2, 3, 4}, true},
+      {scan_tree, "readdir", EIO, {0, 1, 2, 3, 4, 5}, true},
+      {scan_tree, "closedir", EIO, {5}},
+      {remove_tree, "open openat opendir unlinkat rmdir", EMFILE, {0}},
+      {remove_tree, "close closedir", EIO, {1}},
   };
 }
 
 // What every dialogue meets alike.
 std::vector<Row> network_rows() {
   std::vector<Row> rows = {
-      {resolve_name, {"getaddrinfo", EAGAIN}, {0}},
-      {copy_between_servers, {"mkdtemp", EACCES}, {-3}},
-      {copy_between_servers, {"remove", EBUSY}, {0}},
-      {copy_between_servers, {"rmdir", EBUSY}, {0}},
-      {copy_between_servers, {"fclose", ENOSPC}, {-4, 0}},
-      {copy_between_servers, {"fread", EIO}, {-3}},
-      {copy_between_servers, {"connect", ECONNREFUSED}, {-3, -4}},
+      {resolve_name, "getaddrinfo", EAGAIN, {0}},
+      {copy_between_servers, "mkdtemp fread", EACCES, {-3}},
+      {copy_between_servers, "remove rmdir", EBUSY, {0}},
+      {copy_between_servers, "fclose", ENOSPC, {-4, 0}},
+      {copy_between_servers, "connect", ECONNREFUSED, {-3, -4}},
   };
   for (const scripted::Dialogue& dialogue : scripted::dialogues()) {
     const Operation copy = copy_along(dialogue);
     const int network = dialogue.network_failed();
     const int local = dialogue.local_failed();
-    const Row more[] = {
-        {copy, {"socket", EMFILE}, {network}},
-        {copy, {"connect", ECONNREFUSED}, {network}},
-        {copy, {"connect", EINTR}, {0}},
-        {copy, {"poll", EINTR}, {0}},
-        {copy, {"poll", ENOMEM}, {network}},
-        {copy, {"setsockopt", ENOPROTOOPT}, {0}},
-        {copy, {"getsockopt", ENOTSOCK}, {0}},
-        {copy, {"send", ECONNRESET}, {network}},
-        {copy, {"send", EINTR}, {0}},
-        {copy, {"send", shortened}, {0}},
-        {copy, {"recv", ECONNRESET}, {network}},
-        {copy, {"recv", EINTR}, {0}},
-        {copy, {"close", EIO}, {0}},
-        {copy, {"fopen", EACCES}, {local}},
-        {copy, {"fclose", ENOSPC}, {dialogue.download ? local : 0}},
-        {copy, {dialogue.download ? "fwrite" : "fread", EIO}, {local}},
-    };
-    rows.insert(rows.end(), std::begin(more), std::end(more));
-    if (!dialogue.download) rows.push_back({copy, {"stat", EIO}, {local}});
-    if (dialogue.scheme != std::string("smtp")) continue;
-    rows.push_back({copy, {"gethostname", EPERM}, {local}});
-    rows.push_back({copy, {"getaddrinfo", EAGAIN}, {local}});
-    rows.push_back({copy, {"localtime_r", EOVERFLOW}, {local}});
+    const bool download = dialogue.download;
+    rows.insert(rows.end(),
+                {{copy, "socket connect poll send recv", ECONNRESET, {network}},
+                 {copy, "connect poll send recv", EINTR, {0}},
+                 {copy, "send", shortened, {0}},
+                 {copy, "setsockopt getsockopt close", EIO, {0}},
+                 {copy, download ? "fopen fwrite fclose" : "fopen fread stat", EIO, {local}}});
+    if (!download) rows.push_back({copy, "fclose", EIO, {0}});
+    if (dialogue.scheme == std::string("smtp"))
+      rows.push_back({copy, "gethostname getaddrinfo localtime_r", EAGAIN, {local}});
   }
   return rows;
 }
 
 TEST(SystemCalls, OnFilesAndTheHost) {
-  walk_all("failing system calls on files and the host", local_rows());
-  if (keeps_attributes()) walk_all("failing calls on attributes", attribute_rows());
+  std::vector<Row> rows = local_rows();
+  if (keeps_attributes())
+    rows.push_back({hide_file, "getxattr setxattr removexattr stat", EIO, {0}});
+  walk_all("failing system calls on files and the host", rows);
 }
 
 TEST(SystemCalls, OnTheNetwork) {
