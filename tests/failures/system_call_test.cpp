@@ -7,6 +7,7 @@
 
 #include "environment.h"
 #include "failures/operations.h"
+#include "fixtures/plugins/plugin_folder.h"
 #include "zarvo.h"
 
 namespace {
@@ -58,6 +59,21 @@ int library_opened(Attempt& attempt) {
   void* const entry = attempt([&] { return zv_dll_getptr(library, "zv_plugin", nullptr); });
   zv_dll_close(library);
   return library != none && entry != nullptr;
+}
+
+// What cannot be loaded now stays a record that can be loaded later.
+int plugin_loaded(Attempt& attempt) {
+  const PluginFolder folder;
+  folder.add("accept", "a.dll");
+  zv_plugin_t* const record =
+      zv_plugin_create(folder.path().c_str(), "a.dll", "img", 1, 5, nullptr);
+  zv_plugin_unload(record);
+  const int loaded = attempt([&] { return zv_plugin_load(record); });
+  EXPECT_EQ(record->refs, loaded);
+  EXPECT_EQ(record->plugin != nullptr, loaded == 1);
+  EXPECT_EQ(zv_plugin_load(record), 1);
+  zv_plugin_destroy(record);
+  return loaded;
 }
 
 // Names and folders, each with what stands for it when it cannot be had.
@@ -132,6 +148,7 @@ const Operation make_path = {"zv_mkpath", 1, path_made};
 const Operation ask_path = {"zv_stat, zv_access", 1, path_asked};
 const Operation hide_file = {"zv_set_hidden", 1, file_hidden};
 const Operation open_library = {"zv_dll_open, zv_dll_getptr", 1, library_opened};
+const Operation load_plugin = {"zv_plugin_load", 1, plugin_loaded};
 const Operation ask_host = {"zv_username, zv_hostname, zv_getcwd", 1, host_asked};
 const Operation ask_home = {"zv_homedir", 1, home_asked};
 const Operation use_stream = {"streams", 1, stream_used};
@@ -160,6 +177,7 @@ std::vector<Row> local_rows() {
       {open_library, "pread", shortened, {0}},
       {open_library, "dlopen", ENOMEM, {0}},
       {open_library, "close", EIO, {1}},
+      {load_plugin, "stat open fstat pread dlopen dlsym", EMFILE, {0}},
       {ask_host, "getpwuid_r gethostname getcwd", EIO, {0}},
       {ask_home, "getpwuid_r", EIO, {0}},
       {ask_home, "getpwuid_r", ERANGE, {1}},
