@@ -144,7 +144,7 @@ void add_case(size_t size) {
   add_edit(what, "zarvo", text, zv_strupr);
   add_edit(what, "g_ascii_strup", text, [](char* s) {
     char* const upper = g_ascii_strup(s, -1);
-    std::strcpy(s, upper);
+    std::memcpy(s, upper, std::strlen(upper));
     g_free(upper);
   });
   add_string_edit(what, "std::transform", text, [](std::string& s) {

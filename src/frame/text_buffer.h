@@ -49,7 +49,12 @@ class TextBuffer {
     return true;
   }
 
-  [[nodiscard]] bool append(char ch) { return append(std::string_view(&ch, 1)); }
+  [[nodiscard]] bool append(char ch) {
+    if (size_ == capacity) return false;
+    text_[size_] = ch;
+    measure(size_ + 1);
+    return true;
+  }
 
   // Cuts the text to its first `size` characters; a longer size changes nothing.
   void shorten(size_t size) { measure(std::min(size, size_)); }

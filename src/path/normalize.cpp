@@ -7,6 +7,8 @@
 #include "path/components.h"
 #include "path/folder.h"
 #include "path/form.h"
+#include "path/output.h"
+#include "path/plain.h"
 #include "platform/platform.h"
 #include "zarvo.h"
 
@@ -14,8 +16,12 @@ namespace platform = zv::platform;
 
 namespace {
 
+// No locale has white space among the graphic characters of ASCII.
+bool is_space(char ch) {
+  return (ch <= ' ' || ch > '~') && std::isspace(static_cast<unsigned char>(ch)) != 0;
+}
+
 std::string_view without_spaces(std::string_view text) {
-  const auto is_space = [](char ch) { return std::isspace(static_cast<unsigned char>(ch)) != 0; };
   while (!text.empty() && is_space(text.front())) text.remove_prefix(1);
   while (!text.empty() && is_space(text.back())) text.remove_suffix(1);
   return text;
@@ -131,9 +137,7 @@ bool climbs_above_root(const zv::Components& components) {
 }
 
 // False with what is to be left in the caller's buffer.
-bool normalize(const char* path, zv::JoinedPath& out) {
-  zv::PathBuffer text;
-  if (!text.assign(without_spaces(zv::path_text(path)))) return false;
+bool normalize(zv::PathBuffer& text, zv::JoinedPath& out) {
   text.replace('\\', '/');
   squeeze_path(text);
   if (!expand_drive(text)) return false;
@@ -150,8 +154,11 @@ bool normalize(const char* path, zv::JoinedPath& out) {
 }  // namespace
 
 int zv_normalize_path(char* path) {
+  zv::PathBuffer text;
+  if (!text.assign(without_spaces(zv::path_text(path)))) return 0;  // which always fits
+  if (zv::normalize_plain(text, path)) return 1;
   zv::JoinedPath normal;
-  const bool done = normalize(path, normal);
-  zv_strncpy(path, normal.c_str(), ZV_PATH_MAX);
+  const bool done = normalize(text, normal);
+  zv::put(normal.view(), path, ZV_PATH_MAX);
   return done;
 }

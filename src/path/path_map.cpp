@@ -76,13 +76,13 @@ bool add(const zv::PathBuffer& from, const zv::PathBuffer& to) {
 // Where a file of this folder would be if the folder had moved along with the entry's.
 bool candidate_for(const Redirect& entry, std::string_view folder, std::string_view name,
                    zv::PathBuffer& out) {
-  zv::Components of_folder(folder);
-  zv::Components of_from({entry.from, entry.from_size});
+  zv::Pieces of_folder(folder);
+  zv::Pieces of_from({entry.from, entry.from_size});
   zv::JoinedPath relative;
   if (!zv::relate(of_folder, of_from, relative)) return false;
 
-  zv::Components of_relative(relative.view());
-  zv::Components of_to(entry.to);
+  zv::Pieces of_relative(relative.view());
+  zv::Pieces of_to(entry.to);
   zv::JoinedPath moved;
   if (!zv::resolve(of_relative, of_to, moved) || moved.empty()) return false;
   return out.assign(moved.view()) && zv::append_name(out, name);
@@ -123,15 +123,14 @@ void zv_pathmap_clear() {
 int zv_pathmap_locate(char* path) {
   if (exists(path)) return 1;
   zv::PathBuffer folder;
-  zv::PathBuffer name;
   zv::folder_of(path, folder);
-  zv::file_name(path, name);
+  const std::string_view name = zv::file_name(path);
 
   const zv::LockGuard lock(mutex);
   if (!lock.held()) return 0;
   for (const Redirect& entry : redirects) {
     zv::PathBuffer candidate;
-    if (!candidate_for(entry, folder.view(), name.view(), candidate)) continue;
+    if (!candidate_for(entry, folder.view(), name, candidate)) continue;
     if (!exists(candidate.c_str())) continue;
     zv_strncpy(path, candidate.c_str(), ZV_PATH_MAX);
     return 1;

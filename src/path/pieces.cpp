@@ -11,7 +11,7 @@
 namespace {
 
 bool is_dot_or_dots(std::string_view name) {
-  return name == "." || name == "..";
+  return name.starts_with('.') && (name == "." || name == "..");
 }
 
 std::string_view last_component(std::string_view path) {
@@ -20,13 +20,28 @@ std::string_view last_component(std::string_view path) {
   return path;
 }
 
-// Cuts a trimmed path down to its folder.
-[[nodiscard]] bool cut_to_folder(zv::PathBuffer& path) {
-  const std::string_view name = last_component(path.view());
-  const bool whole = is_dot_or_dots(name) || zv::is_root(path.view());
-  if (whole) return true;
-  path.shorten(path.size() - name.size());
-  return zv::trim_slash(path);
+// The folder of a path: a part of its text, but a bare share in `room`, where it gets the separator
+// of a root if that fits.
+std::string_view folder_text(const char* path, zv::PathBuffer& room) {
+  std::string_view text = zv::path_text(path);
+  if (zv::is_root(text)) {
+    if (text.ends_with('/')) return text;
+    return room.assign(text) && room.append('/') ? room.view() : std::string_view();
+  }
+  text = zv::without_slashes(text);
+  const std::string_view name = last_component(text);
+  if (is_dot_or_dots(name) || zv::is_root(text)) return text;
+  text.remove_suffix(name.size());
+  return zv::is_root(text) ? text : zv::without_slashes(text);
+}
+
+// From the dot on; empty, at the end of the path, where there is none.
+std::string_view extension_of(const char* path) {
+  const char* const end = path + std::strlen(path);
+  const char* dot = end;
+  while (dot != path && *dot != '.' && *dot != '/') --dot;
+  const bool starts_extension = *dot == '.' && dot != path && dot[-1] != '/' && dot + 1 != end;
+  return {starts_extension ? dot : end, end};
 }
 
 }  // namespace
@@ -34,15 +49,14 @@ std::string_view last_component(std::string_view path) {
 namespace zv {
 
 void folder_of(const char* path, PathBuffer& out) {
-  out.assign_cut(path);
-  if (!trim_slash(out) || !cut_to_folder(out)) out.clear();
+  if (!out.assign(folder_text(path, out))) out.clear();
 }
 
-void file_name(const char* path, PathBuffer& out) {
-  out.assign_cut(path);
-  if (!trim_slash(out) || is_root(out.view())) out.clear();
-  const std::string_view name = last_component(out.view());
-  if (is_dot_or_dots(name) || !out.assign(name)) out.clear();
+std::string_view file_name(const char* path) {
+  std::string_view text = path_text(path);
+  if (!is_root(text)) text = without_slashes(text);
+  const std::string_view name = last_component(text);
+  return is_root(text) || is_dot_or_dots(name) ? std::string_view() : name;
 }
 
 bool append_name(PathBuffer& folder, std::string_view name) {
@@ -58,11 +72,7 @@ char* zv_slash(const char* path) {
 }
 
 char* zv_dot(const char* path) {
-  const char* const end = path + std::strlen(path);
-  const char* dot = end;
-  while (dot != path && *dot != '.' && *dot != '/') --dot;
-  const bool starts_extension = *dot == '.' && dot != path && dot[-1] != '/' && dot + 1 != end;
-  return const_cast<char*>(starts_extension ? dot : end);
+  return const_cast<char*>(extension_of(path).data());
 }
 
 int zv_add_slash(char* path) {
@@ -98,17 +108,14 @@ void zv_split_path(char* path) {
 }
 
 int zv_extract_directory(const char* path, char* out, size_t size) {
-  zv::PathBuffer folder;
-  zv::folder_of(path, folder);
-  return zv::put(folder.view(), out, size);
+  zv::PathBuffer room;
+  return zv::put(folder_text(path, room), out, size);
 }
 
 int zv_extract_filename(const char* path, char* out, size_t size) {
-  zv::PathBuffer name;
-  zv::file_name(path, name);
-  return zv::put(name.view(), out, size);
+  return zv::put(zv::file_name(path), out, size);
 }
 
 int zv_extract_extension(const char* path, char* out, size_t size) {
-  return zv::put(zv_dot(path), out, size);
+  return zv::put(extension_of(path), out, size);
 }

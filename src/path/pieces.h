@@ -1,4 +1,4 @@
-// The pieces of a path inside the library, in buffers.
+// The pieces of a path inside the library.
 #ifndef ZARVO_PATH_PIECES_H
 #define ZARVO_PATH_PIECES_H
 
@@ -10,7 +10,7 @@ namespace zv {
 
 // What zv_extract_directory() and zv_extract_filename() take out.
 void folder_of(const char* path, PathBuffer& out);
-void file_name(const char* path, PathBuffer& out);
+std::string_view file_name(const char* path);  // a part of it
 
 // Puts a name behind a folder, which may be empty. False when it does not fit.
 [[nodiscard]] bool append_name(PathBuffer& folder, std::string_view name);

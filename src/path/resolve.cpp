@@ -1,4 +1,4 @@
-// Absolute and relative paths: two inverse operations on lists of components.
+// Absolute and relative paths: two inverse operations on the pieces of paths.
 #include "path/resolve.h"
 
 #include <algorithm>
@@ -25,7 +25,7 @@ std::string_view server_of(std::string_view root) {
 }
 
 // Shares of one server are compared like folders of one root.
-void split_shares_of_one_server(Components& path, Components& base) {
+void split_shares_of_one_server(Pieces& path, Pieces& base) {
   const std::string_view ours = path.front();
   const std::string_view theirs = base.front();
   if (share_size(ours) == 0 || share_size(theirs) == 0) return;
@@ -43,9 +43,9 @@ bool base_text(const char* base, PathBuffer& room, std::string_view& text) {
 
 }  // namespace
 
-bool resolve(Components& path, Components& base, JoinedPath& out) {
-  while (!path.empty() && path.front() == ".") path.drop_first();
-  while (!path.empty() && path.front() == ".." && !base.empty()) {
+bool resolve(Pieces& path, Pieces& base, JoinedPath& out) {
+  while (path.begins_with(".")) path.drop_first();
+  while (path.begins_with("..") && !base.empty()) {
     path.drop_first();
     base.drop_last();
   }
@@ -53,7 +53,7 @@ bool resolve(Components& path, Components& base, JoinedPath& out) {
   return join(out, base) && join(out, path) && finish(out);
 }
 
-bool relate(Components& path, Components& base, JoinedPath& out) {
+bool relate(Pieces& path, Pieces& base, JoinedPath& out) {
   if (path.empty() || base.empty()) return false;
   split_shares_of_one_server(path, base);
   if (!same_ignoring_case(path.front(), base.front())) return false;
@@ -61,7 +61,7 @@ bool relate(Components& path, Components& base, JoinedPath& out) {
     path.drop_first();
     base.drop_first();
   }
-  for (size_t i = 0; i < base.size(); ++i)
+  for (; !base.empty(); base.drop_first())
     if (!join(out, "..")) return false;
   return join(out, path) && finish(out);
 }
@@ -72,8 +72,8 @@ int zv_absolute(const char* path, const char* base, char* out, size_t size) {
   zv::PathBuffer room;
   std::string_view folder;
   if (!zv::base_text(base, room, folder)) return 0;
-  zv::Components of_path(zv::path_text(path));
-  zv::Components of_base(folder);
+  zv::Pieces of_path(zv::path_text(path));
+  zv::Pieces of_base(folder);
   zv::JoinedPath absolute;
   if (of_base.empty() || !zv::resolve(of_path, of_base, absolute)) return 0;
   return zv::put(absolute.view(), out, size);
@@ -84,8 +84,8 @@ int zv_relative(const char* path, const char* base, char* out, size_t size) {
   std::string_view folder;
   zv::JoinedPath relative;
   const bool known = zv::base_text(base, room, folder);
-  zv::Components of_path(zv::path_text(path));
-  zv::Components of_base(folder);
+  zv::Pieces of_path(zv::path_text(path));
+  zv::Pieces of_base(folder);
   const bool related = known && zv::relate(of_path, of_base, relative);
   zv::put(related ? relative.view() : path, out, size);
   return related;

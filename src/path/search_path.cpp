@@ -67,14 +67,13 @@ int zv_pathlist(char*** list) {
 }
 
 int zv_path_locate(char* path) {
-  zv::PathBuffer name;
-  zv::file_name(path, name);
+  const std::string_view name = zv::file_name(path);
   SearchPath elements;
   std::string_view element;
   while (elements.next(element)) {
     zv::PathBuffer candidate;
     struct _stat64 st;
-    if (!long_form(element, candidate) || !zv::append_name(candidate, name.view())) continue;
+    if (!long_form(element, candidate) || !zv::append_name(candidate, name)) continue;
     if (zv_stat(candidate.c_str(), &st) != 0) continue;
     zv_strncpy(path, candidate.c_str(), ZV_PATH_MAX);
     return 1;

@@ -61,31 +61,39 @@ class CaselessFilter {
   Block ignored_;  // bits that do not count
 };
 
-// The first place of a block where `equals(place)` holds, of those whose highest bit is set.
+// The first of eight places where `equals(place)` holds, of those whose highest bit is set.
 template <class Equals>
-const char* first_equal(const char* block, Block places, Equals equals) {
-  const Words words = reinterpret_cast<Words>(places) & 0x8080808080808080;
-  for (size_t i = 0; i < 2; ++i) {
-    uint64_t word = words[i];
-    if constexpr (std::endian::native == std::endian::big) word = __builtin_bswap64(word);
-    for (; word != 0; word &= word - 1) {
-      const char* const place = block + 8 * i + std::countr_zero(word) / 8;
-      if (equals(place)) return place;
-    }
+const char* first_of_word(const char* places, uint64_t word, Equals equals) {
+  if constexpr (std::endian::native == std::endian::big) word = __builtin_bswap64(word);
+  for (; word != 0; word &= word - 1) {
+    const char* const place = places + std::countr_zero(word) / 8;
+    if (equals(place)) return place;
   }
   return nullptr;
 }
 
+Words highest_bits(Block places) {
+  return reinterpret_cast<Words>(places) & 0x8080808080808080;
+}
+
 bool any(Block places) {
-  const Words words = reinterpret_cast<Words>(places) & 0x8080808080808080;
+  const Words words = highest_bits(places);
   return (words[0] | words[1]) != 0;
+}
+
+// The same of a block.
+template <class Equals>
+const char* first_of_block(const char* block, Block places, Equals equals) {
+  const Words words = highest_bits(places);
+  const char* const found = first_of_word(block, words[0], equals);
+  return found != nullptr ? found : first_of_word(block + 8, words[1], equals);
 }
 
 // The first place in the text where `equals(place)` holds; it is asked of few other places.
 template <class MakeFilter, class Equals>
 const char* search(std::string_view text, std::string_view needle, MakeFilter filter,
                    Equals equals) {
-  constexpr size_t group = 4;
+  constexpr size_t group = 4 * block_size;
   const size_t length = needle.size();
   const auto first = filter(0);
   const auto middle = filter(length / 2);
@@ -93,24 +101,24 @@ const char* search(std::string_view text, std::string_view needle, MakeFilter fi
   const auto promising = [&](const char* place) {
     return first(load(place)) & middle(load(place + length / 2)) & last(load(place + length - 1));
   };
+  const auto found_in = [&](const char* place) {
+    const Block places = promising(place);
+    return any(places) ? first_of_block(place, places, equals) : nullptr;
+  };
   const char* place = text.data();
   const char* const end = place + (text.size() - length + 1);
-  while (static_cast<size_t>(end - place) >= group * block_size) {
-    Block places[group];
-    for (size_t i = 0; i < group; ++i) places[i] = promising(place + i * block_size);
-    if (any(places[0] | places[1] | places[2] | places[3])) {
-      for (size_t i = 0; i < group; ++i) {
-        const char* const found = first_equal(place + i * block_size, places[i], equals);
-        if (found != nullptr) return found;
-      }
-    }
-    place += group * block_size;
+  while (static_cast<size_t>(end - place) >= group) {
+    const char* const group_end = place + group;
+    const bool none = !any(promising(place) | promising(place + block_size) |
+                           promising(place + 2 * block_size) | promising(place + 3 * block_size));
+    if (none) place = group_end;
+    for (; place != group_end; place += block_size)
+      if (const char* const found = found_in(place); found != nullptr) return found;
   }
   for (; place != end; place += block_size) {
     // The last block overlaps the one before.
     if (static_cast<size_t>(end - place) < block_size) place = end - block_size;
-    const char* const found = first_equal(place, promising(place), equals);
-    if (found != nullptr) return found;
+    if (const char* const found = found_in(place); found != nullptr) return found;
   }
   return nullptr;
 }

@@ -1,0 +1,98 @@
+// The short way to a canonical path: components are copied one by one, each with a separator in
+// front of it unless it is the first, and a ".." takes the one before it back.
+#include "path/plain.h"
+
+#include <array>
+#include <cstdint>
+#include <string_view>
+
+#include "path/form.h"
+#include "platform/platform.h"
+
+namespace zv {
+
+namespace {
+
+enum Kind : uint8_t { ordinary, dot, sign, separator, nul };
+
+// Looked up, because every character is asked. A component that begins with a sign may stand for
+// something else, or be read as a drive.
+constexpr std::array<Kind, 256> kinds = [] {
+  std::array<Kind, 256> map{};
+  map['.'] = dot;
+  map['~'] = map['%'] = map['$'] = map[':'] = sign;
+  map['/'] = map['\\'] = separator;
+  map['\0'] = nul;
+  return map;
+}();
+
+Kind kind_of(char ch) {
+  return kinds[static_cast<unsigned char>(ch)];
+}
+
+bool is_separator(char ch) {
+  return kind_of(ch) == separator;
+}
+
+bool is_end(char ch) {
+  return kind_of(ch) >= separator;
+}
+
+// Writes the root, which takes as much room as it does in the text. False where it is not plain.
+bool write_root(const PathBuffer& text, char* out, size_t& size) {
+  if (is_dos(text.view())) {
+    size = 3;
+    out[0] = text[0];
+    out[1] = ':';
+    out[2] = '/';
+    return is_separator(text[2]) && !is_separator(text[0]) && kind_of(text[0]) != sign;
+  }
+  size = is_separator(text[0]) ? 1 : 0;
+  out[0] = '/';
+  return size == 0 || (!is_separator(text[1]) && platform::current_drive() == 0);
+}
+
+// Takes back the component that a ".." behind it cancels; false where the ".." stays.
+bool take_back(char* start, char*& end) {
+  char* last = end;
+  while (last != start && last[-1] != '/') --last;
+  const std::string_view name(last, static_cast<size_t>(end - last));
+  if (name == ".") end = start;  // it stands in front of all, and the ".." in its place
+  if (name.empty() || name == "." || name == "..") return false;
+  end = last == start ? start : last - 1;
+  return true;
+}
+
+}  // namespace
+
+bool normalize_plain(const PathBuffer& text, char* out) {
+  size_t root = 0;
+  if (!write_root(text, out, root)) return false;
+  const char* const first = text.c_str() + root;
+  char* const start = out + root;
+  char* end = start;
+  for (const char* from = first; *from != '\0';) {
+    const Kind kind = kind_of(*from);
+    if (kind == sign) return false;
+    if (kind == separator) {
+      ++from;
+      continue;
+    }
+    if (kind == dot) {
+      const bool idle = is_end(from[1]) && (from != first || root != 0);
+      const bool dots = from[1] == '.' && is_end(from[2]);
+      if (dots && root != 0 && end == start) return false;
+      if (idle || (dots && take_back(start, end))) {
+        from += dots ? 2 : 1;
+        continue;
+      }
+    }
+    if (end != start) *end++ = '/';
+    for (; !is_end(*from); ++from) *end++ = *from;
+  }
+  if (end - out == 2 && out[1] == ':') *end++ = '/';  // alone, it reads as a drive
+  *end = '\0';
+  return true;
+}
+
+}  // namespace zv
