@@ -155,9 +155,9 @@ const char* find(std::string_view text, std::string_view needle) {
   const auto equals = [needle](const char* place) {
     return *place == needle.front() && std::memcmp(place, needle.data(), needle.size()) == 0;
   };
-  if (!fill_a_block(text, needle)) return search_each(text, needle.size(), equals);
   if (needle.size() == 1)
     return static_cast<const char*>(std::memchr(text.data(), needle.front(), text.size()));
+  if (!fill_a_block(text, needle)) return search_each(text, needle.size(), equals);
   const auto filter = [needle](size_t i) { return ExactFilter(needle[i]); };
   return search(text, needle, filter, equals);
 }

@@ -4,7 +4,10 @@
 // the match hopeless: a run that merely differs is tried again from the star's next place. So once
 // a run has matched up to a further star, the stars before it are settled, only the last one is
 // ever tried again, and neither recursion nor heap is needed. The match is given up as hopeless
-// once the text ends before the pattern does, or the pattern turns out malformed.
+// once the text ends before the pattern does, or the pattern turns out malformed. The run behind
+// the last star is looked for at the end of the text alone, where it has to be.
+#include <algorithm>
+#include <array>
 #include <bit>
 #include <cstring>
 #include <string_view>
@@ -18,6 +21,10 @@ struct Character {
   uint32_t value;
   int length;
 };
+
+bool is_ascii(char ch) {
+  return static_cast<unsigned char>(ch) < 0x80;
+}
 
 bool is_continuation(char ch) {
   return (static_cast<unsigned char>(ch) & 0xC0) == 0x80;
@@ -55,16 +62,14 @@ class Set {
 
  private:
   bool holds(uint32_t value) const {
-    uint32_t first = 0;
-    bool may_start_range = false;
     for (const char* p = members_; p != close_;) {
-      const bool range = may_start_range && *p == '-' && p + 1 != close_;
-      if (range) ++p;
-      const Character member = decode(p);
-      p += member.length;
-      if (!range) first = member.value;
-      if (first <= value && value <= member.value) return true;
-      may_start_range = !range;
+      const Character first = decode(p);
+      p += first.length;
+      if (value == first.value) return true;
+      if (*p != '-' || p + 1 == close_) continue;
+      const Character last = decode(p + 1);
+      p += 1 + last.length;
+      if (first.value < value && value <= last.value) return true;
     }
     return false;
   }
@@ -74,75 +79,110 @@ class Set {
   const char* close_ = nullptr;
 };
 
-// The literal text that a pattern begins with.
-std::string_view literal_head(const char* pattern) {
-  return {pattern, std::strcspn(pattern, "*?[\\")};
+// Looked up, because every character of a pattern is asked.
+constexpr std::array<bool, 256> specials = [] {
+  std::array<bool, 256> map{};
+  for (const unsigned char ch : {'*', '?', '[', ']', '\\', '\0'}) map[ch] = true;
+  return map;
+}();
+
+bool is_special(char ch) {
+  return specials[static_cast<unsigned char>(ch)];
 }
 
-// The start of the literal text that a pattern ends with. A byte of it may stand behind a `\`,
-// which changes nothing, or in a set without its bracket, which matches nothing anyway.
-const char* literal_tail(const char* pattern, const char* end) {
-  const auto is_special = [](char ch) {
-    return ch == '*' || ch == '?' || ch == '[' || ch == ']' || ch == '\\';
-  };
-  while (end != pattern && !is_special(end[-1])) --end;
-  return end;
+// The literal text that a pattern begins with.
+std::string_view literal_head(const char* pattern) {
+  const char* end = pattern;
+  while (!is_special(*end)) ++end;
+  return {pattern, end};
+}
+
+// The literal text that a pattern ends with. A byte of it may stand behind a `\`, which changes
+// nothing, or in a set without its bracket, which matches nothing anyway.
+std::string_view literal_tail(const char* pattern) {
+  const char* const end = pattern + std::strlen(pattern);
+  const char* start = end;
+  while (start != pattern && !is_special(start[-1])) --start;
+  return {start, end};
 }
 
 enum class Outcome { matched, differs, given_up };
 
 class Matcher {
  public:
-  Matcher(std::string_view text, std::string_view pattern)
-      : text_(text.data()),
-        text_end_(text_ + text.size()),
-        pattern_(pattern.data()),
-        pattern_end_(pattern_ + pattern.size()),
-        tail_(literal_tail(pattern_, pattern_end_)) {}
+  Matcher(const char* text, const char* pattern) : text_(text), pattern_(pattern) {}
 
   bool match() {
-    if (!ends_with_tail()) return false;
-    if (tail_ == pattern_) return pattern_end_ - pattern_ == text_end_ - text_;
     if (match_run() != Outcome::matched) return false;
-    while (*pattern_ == '*') {
+    if (*pattern_ == '\0') return *text_ == '\0';
+    text_end_ = text_ + std::strlen(text_);
+    for (bool first = true;; first = false) {
       while (*pattern_ == '*') ++pattern_;
-      if (pattern_ == pattern_end_) return true;
-      if (pattern_ >= tail_ && !is_continuation(*pattern_))
-        return pattern_end_ - pattern_ <= text_end_ - text_;
-      if (!match_behind_star()) return false;
+      if (*pattern_ == '\0') return true;
+      const Run run = measure_run();
+      if (run.is_last) return match_last_run(run);
+      if (first && !ends_with_tail()) return false;
+      if (!(run.is_literal ? match_literal(run.length) : match_behind_star())) return false;
     }
-    return text_ == text_end_;
   }
 
  private:
+  struct Run {
+    size_t length;    // in characters
+    bool is_last;     // and well-formed
+    bool is_literal;  // its bytes stand for themselves
+  };
+
+  // Measures the run behind a star.
+  Run measure_run() const {
+    Run run = {0, true, true};
+    for (const char* p = pattern_;; ++run.length) {
+      for (; !is_special(*p); ++p) ++run.length;
+      if (*p == '\0') return run;
+      if (*p == '*') return {run.length, false, run.is_literal};
+      run.is_literal = false;
+      if (*p == '[') {
+        const Set set(p);
+        if (!set.closed()) return {run.length, false, false};
+        p = set.end();
+      } else {
+        p += *p == '\\' && p[1] != '\0' ? 2 : 1;
+      }
+    }
+  }
+
   // A text that does not end like the pattern cannot match.
   bool ends_with_tail() const {
-    const auto length = static_cast<size_t>(pattern_end_ - tail_);
-    return length <= static_cast<size_t>(text_end_ - text_) &&
-           std::memcmp(text_end_ - length, tail_, length) == 0;
+    return std::string_view(text_, text_end_).ends_with(literal_tail(pattern_));
+  }
+
+  // The last run must end where the text does. Where its characters are bytes there, that leaves
+  // one place for it.
+  bool match_last_run(const Run& run) {
+    if (run.length > static_cast<size_t>(text_end_ - text_)) return false;
+    const char* const start = text_end_ - run.length;
+    const bool starts_character = run.is_literal && !is_continuation(*pattern_);
+    if (!starts_character && !std::all_of(start, text_end_, is_ascii)) return match_behind_star();
+    text_ = start;
+    return match_run() == Outcome::matched;
   }
 
   // Matches the pattern up to its next star, or to its end, from here on.
   Outcome match_run() {
-    while (pattern_ != pattern_end_ && *pattern_ != '*') {
-      if (text_ == text_end_) return Outcome::given_up;
-      Outcome outcome;
-      switch (*pattern_) {
-        case '?':
-          outcome = match_any();
-          break;
-        case '[':
-          outcome = match_set();
-          break;
-        case '\\':
-          ++pattern_;
-          [[fallthrough]];
-        default:
-          outcome = match_byte();
-      }
+    for (;;) {
+      for (; !is_special(*pattern_); ++text_, ++pattern_)
+        if (*text_ != *pattern_) return *text_ == '\0' ? Outcome::given_up : Outcome::differs;
+      if (*pattern_ == '*' || *pattern_ == '\0') return Outcome::matched;
+      if (*text_ == '\0') return Outcome::given_up;
+      const Outcome outcome = match_special();
       if (outcome != Outcome::matched) return outcome;
     }
-    return Outcome::matched;
+  }
+
+  Outcome match_special() {
+    if (*pattern_ == '?') return match_any();
+    if (*pattern_ == '[') return match_set();
+    return match_byte();
   }
 
   Outcome match_any() {
@@ -153,6 +193,7 @@ class Matcher {
 
   // A `\` at the very end leaves the NUL to compare with, which no byte of a text equals.
   Outcome match_byte() {
+    if (*pattern_ == '\\') ++pattern_;
     if (*text_ != *pattern_) return Outcome::differs;
     ++text_;
     ++pattern_;
@@ -166,6 +207,15 @@ class Matcher {
     text_ += character.length;
     pattern_ = set.end();
     return set.takes(character.value) ? Outcome::matched : Outcome::differs;
+  }
+
+  bool match_literal(size_t length) {
+    if (is_continuation(*pattern_)) return match_behind_star();
+    text_ = zv::find({text_, text_end_}, {pattern_, length});
+    if (text_ == nullptr) return false;
+    text_ += length;
+    pattern_ += length;
+    return true;
   }
 
   // Finds the first place from here on where the run behind a star matches; the last run must also
@@ -190,7 +240,10 @@ class Matcher {
     if (*run == '?' || *run == '\\') return text;
     if (*run == '[') return next_in_set(text, Set(run));
     // Any other byte than a continuation can only be the first of a character.
-    if (!is_continuation(*run)) return zv::find({text, text_end_}, literal_head(run));
+    if (!is_continuation(*run)) {
+      const size_t length = std::max<size_t>(literal_head(run).size(), 1);  // a lone `]` is literal
+      return zv::find({text, text_end_}, {run, length});
+    }
     while (text != text_end_ && *text != *run) text += decode(text).length;
     return text != text_end_ ? text : nullptr;
   }
@@ -205,14 +258,32 @@ class Matcher {
   }
 
   const char* text_;
-  const char* text_end_;
   const char* pattern_;
-  const char* pattern_end_;
-  const char* tail_;
+  const char* text_end_ = nullptr;  // measured at the first star
 };
+
+// The text behind a star, to the pattern's end.
+bool ends_with(const char* text, std::string_view tail) {
+  const size_t length = std::strlen(text);
+  if (length < tail.size()) return false;
+  const char* end = text + length;
+  for (; !tail.empty(); tail.remove_suffix(1))
+    if (*--end != tail.back()) return false;
+  return true;
+}
 
 }  // namespace
 
+// Literal text up to a star and behind it, as most patterns have it, is compared where it has to
+// be; the matcher gets the others, from the first character on that is not literal.
 int zv_strpat(const char* text, const char* pattern) {
+  for (; !is_special(*pattern); ++text, ++pattern)
+    if (*text != *pattern) return 0;
+  if (*pattern == '\0') return *text == '\0' ? 1 : 0;
+  if (*pattern == '*') {
+    const std::string_view tail = literal_head(pattern + 1);
+    const bool is_last = pattern[1 + tail.size()] == '\0';
+    if (is_last && !is_continuation(pattern[1])) return ends_with(text, tail) ? 1 : 0;
+  }
   return Matcher(text, pattern).match() ? 1 : 0;
 }
