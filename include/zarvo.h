@@ -641,7 +641,8 @@ ZV_API int zv_strpat(const char* text, const char* pattern);
  * A string list is a heap array of heap texts with a NULL entry behind the last: walk it, index it,
  * sort it with qsort() as it lies. Whoever holds the list owns the array and the texts, and gives
  * both back with zv_strlist_free(). The empty list is an array with only the NULL in it, not a NULL
- * pointer. The array has no room to spare: where it may move, functions take its address.
+ * pointer. Nobody can count on room to spare in the array: where it may move, functions take its
+ * address.
  *
  * Most functions take a count `n` of the entries, which saves counting them again; a negative `n`
  * counts them up to the NULL. A count above the real one is not noticed. Positions begin at 0.

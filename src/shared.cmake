@@ -28,7 +28,8 @@ if(WIN32)
 else()
   target_link_libraries(zarvo PRIVATE ${CMAKE_DL_LIBS})
   target_link_options(zarvo PRIVATE
-    -Wl,--version-script,${CMAKE_CURRENT_BINARY_DIR}/zarvo.map)
+    -Wl,--version-script,${CMAKE_CURRENT_BINARY_DIR}/zarvo.map
+    -Wl,-Bsymbolic-functions)  # the library's own calls are bound when it is linked, not when it loads
   if(NOT ZARVO_SANITIZE)
     target_link_options(zarvo PRIVATE -Wl,-z,defs)
   endif()

@@ -13,7 +13,7 @@ namespace zv {
 inline bool put(std::string_view text, char* out, size_t size) {
   if (size == 0) return false;
   const size_t kept = std::min(text.size(), size - 1);
-  std::memmove(out, text.data(), kept);
+  if (kept != 0) std::memmove(out, text.data(), kept);
   out[kept] = '\0';
   return kept != 0;
 }

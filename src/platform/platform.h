@@ -46,6 +46,11 @@ bool user_name(TextBuffer<257>& out);
 bool host_name(TextBuffer<16>& out);
 bool home_folder(PathBuffer& out);  // as the platform writes it
 
+// ---- heap.cpp: blocks of the C heap -------------------------------------------------------------
+
+// How many bytes a block has room for, at least what was asked for; 0 for nullptr.
+size_t block_size(void* block);
+
 // ---- letter_case.cpp: case in the current locale, byte by byte ----------------------------------
 
 // What tolower() or toupper() makes of each byte: the platform's own table, or `room` filled.

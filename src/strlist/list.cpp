@@ -5,6 +5,7 @@
 #include <cstring>
 #include <utility>
 
+#include "platform/platform.h"
 #include "strlist/list_owner.h"
 #include "zarvo.h"
 
@@ -14,10 +15,17 @@ int count_of(char** list, int n) {
   return n < 0 ? zv_strlist_len(list) : n;
 }
 
-// The list's array with room for `count` entries and the NULL; nullptr when memory ran out.
-char** resized(char** list, int count) {
-  const size_t entries = static_cast<size_t>(count) + 1;
-  return static_cast<char**>(std::realloc(list, entries * sizeof(char*)));
+// The list's array with room for so many entries and the NULL; nullptr when memory ran out.
+char** resized(char** list, size_t count) {
+  return static_cast<char**>(std::realloc(list, (count + 1) * sizeof(char*)));
+}
+
+// The same for a list that may grow further: an array that moves gets room to spare, and one that
+// has room stays.
+char** grown(char** list, int count) {
+  const auto needed = static_cast<size_t>(count);
+  if (zv::platform::block_size(list) >= (needed + 1) * sizeof(char*)) return list;
+  return resized(list, needed + needed / 2);
 }
 
 // The end of the piece that starts here: its separator, or its NUL in a zero-separated sequence.
@@ -76,15 +84,15 @@ int zv_strlist_free(char** list, int n) {
 int zv_strlist_insert(char*** list, int n, int pos, const char* s) {
   const int count = count_of(*list, n);
   const int at = pos < 0 ? count : pos;
-  zv::HeapPtr<char> copy(zv_strredup(nullptr, s));
+  zv::HeapPtr<char> copy(static_cast<char*>(zv_dalloc(s, std::strlen(s) + 1)));
   if (copy == nullptr) return 0;
-  char** const grown = resized(*list, count + 1);
-  if (grown == nullptr) return 0;
+  char** const entries = grown(*list, count + 1);
+  if (entries == nullptr) return 0;
 
-  std::move_backward(grown + at, grown + count, grown + count + 1);
-  grown[at] = copy.release();
-  grown[count + 1] = nullptr;
-  *list = grown;
+  std::move_backward(entries + at, entries + count, entries + count + 1);
+  entries[at] = copy.release();
+  entries[count + 1] = nullptr;
+  *list = entries;
   return 1;
 }
 
@@ -106,11 +114,11 @@ int zv_strlist_replace(char** list, int pos, const char* s) {
 int zv_strlist_cat(char*** list, int count, char** other, int other_count) {
   const int own = count_of(*list, count);
   const int added = count_of(other, other_count);
-  char** const grown = resized(*list, own + added);
-  if (grown == nullptr) return -1;
-  std::copy_n(other, added, grown + own);
-  grown[own + added] = nullptr;
-  *list = grown;
+  char** const entries = grown(*list, own + added);
+  if (entries == nullptr) return -1;
+  std::copy_n(other, added, entries + own);
+  entries[own + added] = nullptr;
+  *list = entries;
   return own + added;
 }
 
