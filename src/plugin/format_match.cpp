@@ -28,11 +28,13 @@ char lower(char ch) {
   return static_cast<char>(std::tolower(static_cast<unsigned char>(ch)));
 }
 
-// Takes the field in front of the next `|` off `rest`; false when no `|` is left.
+// Takes the field in front of the next `|` off `rest`; false when no `|` is left. Patterns are too
+// short for a call of strchr() to pay.
 bool next_field(const char*& rest, std::string_view& field) {
-  const char* const end = std::strchr(rest, '|');
-  if (end == nullptr) return false;
+  const char* end = rest;
+  while (*end != '|' && *end != '\0') ++end;
   field = {rest, end};
+  if (*end == '\0') return false;
   rest = end + 1;
   return true;
 }
@@ -49,8 +51,9 @@ bool is_same(char in_pattern, char in_name) {
 bool matches_wildcards(const zv::PathBuffer& name, std::string_view star,
                        std::string_view pattern) {
   zv::PathBuffer text;
-  if (!text.append(star) || !text.append(pattern)) return false;
-  text.edit_shrinking(zv_strlwr);
+  if (!text.append(star)) return false;
+  for (const char ch : pattern)
+    if (!text.append(lower(ch))) return false;
   return zv_strpat(name.c_str(), text.c_str()) != 0;
 }
 
@@ -92,9 +95,11 @@ struct Ends {
 
 bool matches_entry(const zv::PathBuffer& name, const char* entry) {
   const Ends ends = {name[0], name.back()};
+  const char* const description_end = std::strchr(entry, '|');
+  if (description_end == nullptr) return false;
+  const char* rest = description_end + 1;
   std::string_view field;
-  if (!next_field(entry, field)) return false;
-  while (next_field(entry, field))
+  while (next_field(rest, field))
     if (ends.may_match(field) && matches_pattern(name, field)) return true;
   return false;
 }

@@ -6,10 +6,12 @@
 
 namespace {
 
-// No locale has white space among the graphic characters of ASCII, nor takes it from the blank.
+// The same in every locale: the blank and what moves the cursor are white space, the graphic
+// characters of ASCII are not.
 bool is_space(char ch) {
   if (ch > ' ' && ch <= '~') return false;
-  return ch == ' ' || std::isspace(static_cast<unsigned char>(ch)) != 0;
+  return ch == ' ' || (ch >= '\t' && ch <= '\r') ||
+         std::isspace(static_cast<unsigned char>(ch)) != 0;
 }
 
 // The length of the text without the white space at its end.

@@ -1,4 +1,5 @@
 // Replacement of every occurrence, and brackets around a text.
+#include <algorithm>
 #include <cstring>
 
 #include "zarvo.h"
@@ -7,7 +8,18 @@ namespace {
 
 using Find = const char* (*)(const char* s, const char* needle);
 
+const char* find_exact(const char* s, const char* needle) {
+  return std::strstr(s, needle);
+}
+
+const char* find_without_case(const char* s, const char* needle) {
+  return zv_stristr(s, needle);
+}
+
 size_t count_occurrences(const char* found, const char* needle, size_t length, Find find) {
+  // Single bytes lie so close together that it takes less time to look at all of them at once.
+  if (length == 1 && find == find_exact)
+    return static_cast<size_t>(std::count(found, found + std::strlen(found), *needle));
   size_t count = 0;
   for (; found != nullptr; found = find(found + length, needle)) ++count;
   return count;
@@ -40,14 +52,6 @@ int replace_all(char* s, const char* needle, const char* repl, Find find) {
     to += kept;
   }
   return 1;
-}
-
-const char* find_exact(const char* s, const char* needle) {
-  return std::strstr(s, needle);
-}
-
-const char* find_without_case(const char* s, const char* needle) {
-  return zv_stristr(s, needle);
 }
 
 }  // namespace
