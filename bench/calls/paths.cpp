@@ -221,6 +221,23 @@ void add_map(int folders) {
   });
 }
 
+// No entry leads to the path, so each is tried.
+void take_map(int folders) {
+  zv_pathmap_clear();
+  for (int i = 0; i < folders; ++i)
+    zv_pathmap(("/old/folder" + std::to_string(i) + "/x").c_str(), "/new/place/x");
+}
+
+template <int folders>
+void add_locate() {
+  item.add("path map, a path not found @" + std::to_string(folders), "zarvo",
+           [] {
+             char path[ZV_PATH_MAX] = "/old/folder/below/name";
+             return zv_pathmap_locate(path);
+           })
+      ->Setup([](const benchmark::State&) { take_map(folders); });
+}
+
 }  // namespace
 
 void bench::add_cases() {
@@ -235,4 +252,7 @@ void bench::add_cases() {
   add_split(relative);
   add_pieces(absolute);
   for (const int folders : {10, 100, 1000}) add_map(folders);
+  add_locate<10>();
+  add_locate<100>();
+  add_locate<1000>();
 }

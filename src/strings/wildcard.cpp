@@ -30,11 +30,9 @@ bool is_continuation(char ch) {
   return (static_cast<unsigned char>(ch) & 0xC0) == 0x80;
 }
 
-// The character at `p`, in front of the NUL or bracket that no multi-byte character can run over:
-// two to six bytes of UTF-8, of any value, or else the one byte.
-Character decode(const char* p) {
+// Two to six bytes of UTF-8, of any value, or else the one byte.
+Character decode_sequence(const char* p) {
   const auto byte = static_cast<unsigned char>(*p);
-  if (byte < 0xC0) return {byte, 1};
   const int ones = std::countl_one(byte);
   if (ones > 6) return {byte, 1};
   uint32_t value = byte & (0x7FU >> ones);
@@ -43,6 +41,12 @@ Character decode(const char* p) {
     value = value << 6 | (static_cast<unsigned char>(p[i]) & 0x3FU);
   }
   return {value, ones};
+}
+
+// The character at `p`, in front of the NUL or bracket that no multi-byte character can run over.
+inline Character decode(const char* p) {
+  const auto byte = static_cast<unsigned char>(*p);
+  return byte < 0xC0 ? Character{byte, 1} : decode_sequence(p);
 }
 
 // A set, from its opening bracket on.
