@@ -89,12 +89,42 @@ const char* first_of_block(const char* block, Block places, Equals equals) {
   return found != nullptr ? found : first_of_word(block + 8, words[1], equals);
 }
 
-// The first place in the text where `equals(place)` holds; it is asked of few other places.
-template <class MakeFilter, class Equals>
-const char* search(std::string_view text, std::string_view needle, MakeFilter filter,
+// The same by a number that stands for as many bytes as the needle has, and moves along with them:
+// the time does not depend on how much of the needle fits where.
+template <class Fold, class Equals>
+const char* search_rolling(std::string_view text, std::string_view needle, Fold fold,
+                           Equals equals) {
+  constexpr uint64_t base = 0x9e3779b97f4a7c15;
+  uint64_t wanted = 0;
+  uint64_t here = 0;
+  uint64_t leaving = 1;
+  for (size_t i = 0; i < needle.size(); ++i) {
+    wanted = wanted * base + fold(needle[i]);
+    here = here * base + fold(text[i]);
+    leaving *= base;
+  }
+  const char* place = text.data();
+  const char* const last = place + (text.size() - needle.size());
+  for (; here != wanted || !equals(place); ++place) {
+    if (place == last) return nullptr;
+    here = here * base + fold(place[needle.size()]) - leaving * fold(*place);
+  }
+  return place;
+}
+
+// The first place in the text where `equals(place)` holds; it is asked of few other places. Bytes
+// that it compared in vain are counted: a text that has too many gets the even way.
+template <class MakeFilter, class Fold, class Equals>
+const char* search(std::string_view text, std::string_view needle, MakeFilter filter, Fold fold,
                    Equals equals) {
   constexpr size_t group = 4 * block_size;
+  constexpr size_t patience = 4096;
   const size_t length = needle.size();
+  size_t in_vain = 0;
+  const auto counted = [&](const char* place) {
+    in_vain += length;
+    return equals(place);
+  };
   const auto first = filter(0);
   const auto middle = filter(length / 2);
   const auto last = filter(length - 1);
@@ -103,7 +133,7 @@ const char* search(std::string_view text, std::string_view needle, MakeFilter fi
   };
   const auto found_in = [&](const char* place) {
     const Block places = promising(place);
-    return any(places) ? first_of_block(place, places, equals) : nullptr;
+    return any(places) ? first_of_block(place, places, counted) : nullptr;
   };
   const char* place = text.data();
   const char* const end = place + (text.size() - length + 1);
@@ -114,6 +144,9 @@ const char* search(std::string_view text, std::string_view needle, MakeFilter fi
     if (none) place = group_end;
     for (; place != group_end; place += block_size)
       if (const char* const found = found_in(place); found != nullptr) return found;
+    const auto done = static_cast<size_t>(place - text.data());
+    if (in_vain > patience + 8 * done && place != end)
+      return search_rolling({place, text.size() - done}, needle, fold, equals);
   }
   for (; place != end; place += block_size) {
     // The last block overlaps the one before.
@@ -159,7 +192,7 @@ const char* find(std::string_view text, std::string_view needle) {
     return static_cast<const char*>(std::memchr(text.data(), needle.front(), text.size()));
   if (!fill_a_block(text, needle)) return search_each(text, needle.size(), equals);
   const auto filter = [needle](size_t i) { return ExactFilter(needle[i]); };
-  return search(text, needle, filter, equals);
+  return search(text, needle, filter, byte_of, equals);
 }
 
 const char* find_without_case(std::string_view text, std::string_view needle,
@@ -177,7 +210,8 @@ const char* find_without_case(std::string_view text, std::string_view needle,
   const auto filter = [needle, ascii_case](size_t i) {
     return CaselessFilter(needle[i], ascii_case);
   };
-  return search(text, needle, filter, equals);
+  const auto fold = [lower](char ch) { return static_cast<uint64_t>(lower[byte_of(ch)]); };
+  return search(text, needle, filter, fold, equals);
 }
 
 }  // namespace zv

@@ -86,7 +86,7 @@ class Set {
 // Looked up, because every character of a pattern is asked.
 constexpr std::array<bool, 256> specials = [] {
   std::array<bool, 256> map{};
-  for (const unsigned char ch : {'*', '?', '[', ']', '\\', '\0'}) map[ch] = true;
+  for (const char ch : {'*', '?', '[', ']', '\\', '\0'}) map[static_cast<unsigned char>(ch)] = true;
   return map;
 }();
 
