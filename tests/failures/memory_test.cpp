@@ -63,10 +63,10 @@ Operation list_change(const char* name, const char* after, Change change) {
 
 int concatenated_list(Attempt& attempt) {
   char** list = nullptr;
-  zv_strlist(&list, "a;", ';');
-  char* other[] = {zv_strredup(nullptr, "b"), nullptr};
+  zv_strlist(&list, "a;b;", ';');  // in a block that has room for no more
+  char* other[] = {zv_strredup(nullptr, "c"), nullptr};
   const int count = attempt([&] { return zv_strlist_cat(&list, -1, other, -1); });
-  EXPECT_EQ(texts(list), count < 0 ? "a|" : "a|b|");
+  EXPECT_EQ(texts(list), count < 0 ? "a|b|" : "a|b|c|");
   zv_strlist_free(list, -1);
   if (count < 0) zv_free(other[0]);
   return count;
@@ -253,7 +253,7 @@ std::vector<Row> rows() {
       row(list_change("zv_strlist_reduce", "b|",
                       [](char*** l) { return zv_strlist_reduce(l, -1, 1); }),
           {1}),
-      row({"zv_strlist_cat", 2, concatenated_list}, {-1}),
+      row({"zv_strlist_cat", 3, concatenated_list}, {-1}),
       row({"zv_strlist_set, zv_strlist_iset", 200, list_as_set}, {200}),
       row(put("7", large, 1, "kept|", "kept|" + large + "|"), {0}),
       row(put("7", "anew", 0, "none", "anew|"), {0}),
