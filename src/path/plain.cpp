@@ -63,6 +63,18 @@ bool take_back(char* start, char*& end) {
   return true;
 }
 
+// The size of a component of dots that is gone with this; 0 where it stays, or is a name.
+size_t take_dots(const char* component, bool has_front, char* start, char*& end) {
+  if (is_end(component[1])) return has_front ? 1 : 0;
+  const bool is_dots = component[1] == '.' && is_end(component[2]);
+  return is_dots && take_back(start, end) ? 2 : 0;
+}
+
+bool begins_with_dots(const char* start, const char* end) {
+  const std::string_view path(start, static_cast<size_t>(end - start));
+  return path == ".." || path.starts_with("../");
+}
+
 }  // namespace
 
 bool normalize_plain(const PathBuffer& text, char* out) {
@@ -79,17 +91,14 @@ bool normalize_plain(const PathBuffer& text, char* out) {
       continue;
     }
     if (kind == dot) {
-      const bool idle = is_end(from[1]) && (from != first || root != 0);
-      const bool dots = from[1] == '.' && is_end(from[2]);
-      if (dots && root != 0 && end == start) return false;
-      if (idle || (dots && take_back(start, end))) {
-        from += dots ? 2 : 1;
-        continue;
-      }
+      const size_t size = take_dots(from, root != 0 || from != first, start, end);
+      from += size;
+      if (size != 0) continue;
     }
     if (end != start) *end++ = '/';
     for (; !is_end(*from); ++from) *end++ = *from;
   }
+  if (root != 0 && begins_with_dots(start, end)) return false;
   if (end - out == 2 && out[1] == ':') *end++ = '/';  // alone, it reads as a drive
   *end = '\0';
   return true;
