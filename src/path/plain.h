@@ -6,9 +6,10 @@
 
 namespace zv {
 
-// Writes the canonical form into a buffer of ZV_PATH_MAX bytes, in one pass over the text. False,
-// with anything in the buffer, for a path that it leaves to the long way: one with a share, with a
-// drive to be looked up, with a name that stands for something else, or above its root.
+// Writes the canonical form, which is never longer than the text, into a buffer of ZV_PATH_MAX
+// bytes, in one pass over the text. False, with anything in the buffer, for a path that it leaves
+// to the long way: one with a share, with a drive to be looked up, with a name that stands for
+// something else, or above its root.
 [[nodiscard]] bool normalize_plain(const PathBuffer& text, char* out);
 
 }  // namespace zv
