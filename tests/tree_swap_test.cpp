@@ -102,6 +102,15 @@ const char* native_path(const char* path, PathBuffer&) {
   return path;
 }
 
+// A removal selects nothing.
+int status(const char*, struct _stat64*) {
+  return -1;
+}
+
+bool is_hidden(const char*) {
+  return false;
+}
+
 }  // namespace zv::platform
 
 namespace {

@@ -5,6 +5,7 @@
 #include <cstring>
 
 #include "file/search.h"
+#include "file/select.h"
 
 namespace zv {
 
@@ -38,15 +39,17 @@ class Scan {
       if (is_dot_or_dots(name)) continue;
       path_.shorten(prefix);
       if (full_path_ && !(has_room && path_.append(name))) return false;
-      if (!store(dir, name)) return false;
+      if (wanted(dir, search.entry()) && !list_.append(full_path_ ? path_.view() : name))
+        return false;
       if (options_.recursive && !descend(search)) return false;
     } while (search.next());
     return true;
   }
 
-  bool store(const char* dir, const char* name) {
-    if (options_.filter != nullptr && options_.filter(dir, name, options_.user) == 0) return true;
-    return list_.append(full_path_ ? path_.view() : name);
+  bool wanted(const char* dir, const platform::Entry& entry) const {
+    if (options_.filter != nullptr) return options_.filter(dir, entry.name, options_.user) != 0;
+    return options_.selection == nullptr ||
+           selects(*options_.selection, dir, entry.name, entry.kind);
   }
 
   bool descend(const Search& parent) {
@@ -82,7 +85,13 @@ int zv_dir_scan(const char* dir, char*** list, dir_filter_t filter, void* user, 
   *list = nullptr;
   zv::ListOwner found;
   if (!found.reserve(0)) return -1;
-  const zv::ScanOptions options = {filter, user, full_path != 0, recursive != 0};
+  zv::ScanOptions options = {.full_path = full_path != 0, .recursive = recursive != 0};
+  if (filter == reinterpret_cast<dir_filter_t>(zv_dir_select)) {
+    options.selection = static_cast<const dirsel_t*>(user);
+  } else {
+    options.filter = filter;
+    options.user = user;
+  }
   // Nothing stored yet reads as an empty folder, whatever stopped the scan.
   if (!zv::scan(dir, options, found) && found.count() > 0) return -1;
   const int count = found.count();

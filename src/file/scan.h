@@ -10,6 +10,7 @@ namespace zv {
 struct ScanOptions {
   dir_filter_t filter = nullptr;  // nullptr keeps every entry
   void* user = nullptr;
+  const dirsel_t* selection = nullptr;  // asked where there is no filter
   bool full_path = false;
   bool recursive = false;  // asks for full paths too
 };

@@ -2,12 +2,12 @@
 //
 // Everything that is asked here is only read, so the order is free: the patterns come first, and an
 // entry that matches none costs no call to the platform.
+#include "file/select.h"
+
 #include <cstring>
 
-#include "platform/platform.h"
-#include "zarvo.h"
-
 namespace platform = zv::platform;
+using platform::EntryKind;
 
 namespace {
 
@@ -70,21 +70,33 @@ class Matcher {
          path.append(name);
 }
 
+// What the entry is behind its links; unknown when it is gone.
+EntryKind kind_behind(const char* path, EntryKind kind) {
+  if (kind == EntryKind::directory || kind == EntryKind::other) return kind;
+  struct _stat64 st;
+  if (platform::status(path, &st) != 0) return EntryKind::unknown;
+  return (st.st_mode & kind_mask) == directory_kind ? EntryKind::directory : EntryKind::other;
+}
+
 }  // namespace
+
+bool zv::selects(const dirsel_t& sel, const char* dir, const char* name, EntryKind kind) {
+  const Matcher matcher(name, sel.match_case != 0);
+  const bool as_directory =
+      kind != EntryKind::other && matcher.matches_one_of(sel.dir_patterns, sel.separators);
+  const bool as_file =
+      kind != EntryKind::directory && matcher.matches_one_of(sel.file_patterns, sel.separators);
+  if (!as_directory && !as_file) return false;
+
+  zv::PathBuffer path;
+  if (!join(path, dir, name)) return false;
+  kind = kind_behind(path.c_str(), kind);
+  if (kind == EntryKind::unknown || !(kind == EntryKind::directory ? as_directory : as_file))
+    return false;
+  return sel.show_hidden != 0 || !platform::is_hidden(path.c_str());
+}
 
 int zv_dir_select(const char* dir, const char* name, const dirsel_t* sel) {
   if (name == nullptr || *name == '\0') return 0;
-  if (sel == nullptr) return 1;
-
-  const Matcher matcher(name, sel->match_case != 0);
-  const bool as_directory = matcher.matches_one_of(sel->dir_patterns, sel->separators);
-  const bool as_file = matcher.matches_one_of(sel->file_patterns, sel->separators);
-  if (!as_directory && !as_file) return 0;
-
-  zv::PathBuffer path;
-  struct _stat64 st;
-  if (!join(path, dir, name) || platform::status(path.c_str(), &st) != 0) return 0;
-  const bool is_directory = (st.st_mode & kind_mask) == directory_kind;
-  if (is_directory ? !as_directory : !as_file) return 0;
-  return sel->show_hidden != 0 || !platform::is_hidden(path.c_str());
+  return sel == nullptr || zv::selects(*sel, dir, name, EntryKind::unknown);
 }

@@ -41,16 +41,13 @@ bool plugin_folder(const BaseName& base, zv::PathBuffer& folder) {
          zv_stat(folder.c_str(), &st) == 0;
 }
 
-int is_candidate(const char* dir, const char* name, void* selection) {
-  return zv_dir_select(dir, name, static_cast<const dirsel_t*>(selection));
-}
-
 // How many files may be plugins of the API, listed in `names`.
 int find_candidates(const zv::PathBuffer& folder, const BaseName& base, char*** names) {
   zv::TextBuffer<BaseName::capacity + sizeof "_*.dll"> pattern;
   if (!pattern.assign(base.view()) || !pattern.append("_*.dll")) return 0;
   dirsel_t selection = {"", pattern.c_str(), nullptr, 0, 0};
-  return zv_dir_scan(folder.c_str(), names, is_candidate, &selection, 0, 0);
+  const auto filter = reinterpret_cast<dir_filter_t>(zv_dir_select);
+  return zv_dir_scan(folder.c_str(), names, filter, &selection, 0, 0);
 }
 
 void report_rejection(const Request& request, int code) {

@@ -8,13 +8,6 @@
 #include "path_text.h"
 
 namespace tool {
-namespace {
-
-int select(const char* folder, const char* name, void* selection) {
-  return zv_dir_select(folder, name, static_cast<const dirsel_t*>(selection));
-}
-
-}  // namespace
 
 bool is_folder(const std::string& path) {
   struct _stat64 status = {};
@@ -27,8 +20,8 @@ bool is_folder(const std::string& path) {
 }
 
 bool Listing::scan(const std::string& folder, dirsel_t* selection, bool recursive) {
-  const int count = zv_dir_scan(folder.c_str(), &list_, selection != nullptr ? select : nullptr,
-                                selection, recursive, recursive);
+  const auto select = reinterpret_cast<dir_filter_t>(zv_dir_select);
+  const int count = zv_dir_scan(folder.c_str(), &list_, select, selection, recursive, recursive);
   if (count < 0) {
     complain("an entry below " + folder + " cannot be examined");
     return false;
