@@ -1,6 +1,7 @@
 // Making what a path names: a chain of folders, an empty file in them.
 #include "frame/owner.h"
 #include "path/components.h"
+#include "path/form.h"
 #include "platform/platform.h"
 #include "zarvo.h"
 
@@ -22,11 +23,9 @@ bool exists(const char* path) {
 }
 
 // The path of the first `count` pieces, a root with its separator.
-bool join_first(const zv::Components& pieces, size_t count, zv::JoinedPath& out) {
-  out.clear();
-  for (size_t i = 0; i < count; ++i)
-    if (!zv::join(out, pieces[i])) return false;
-  return zv::finish(out);
+bool take_first(const zv::Components& pieces, size_t count, zv::PathBuffer& out) {
+  const std::string_view last = pieces[count - 1];
+  return out.assign({pieces[0].data(), last.data() + last.size()}) && zv::trim_slash(out);
 }
 
 // Where another process was quicker, its folder serves as well.
@@ -35,17 +34,17 @@ bool make_folder(const char* path) {
 }
 
 bool make_folders(const zv::Components& pieces) {
-  zv::JoinedPath prefix;
+  zv::PathBuffer prefix;
   // What exists tells that everything in front of it does, so the search for it starts at the end;
   // but a platform that reads ".." in the text alone tells nothing about what stands before that.
   size_t made = 0;
   while (made < pieces.size() && pieces[made] != "..") ++made;
   for (; made > 0; --made) {
-    if (!join_first(pieces, made, prefix)) return false;
+    if (!take_first(pieces, made, prefix)) return false;
     if (exists(prefix.c_str())) break;
   }
   for (; made < pieces.size(); ++made)
-    if (!join_first(pieces, made + 1, prefix) || !make_folder(prefix.c_str())) return false;
+    if (!take_first(pieces, made + 1, prefix) || !make_folder(prefix.c_str())) return false;
   return true;
 }
 

@@ -62,8 +62,7 @@ class TextBuffer {
   void clear() { shorten(0); }
 
   void replace(char from, char to) {
-    for (size_t i = 0; i < size_; ++i)
-      if (text_[i] == from) text_[i] = to;
+    for (size_t i = 0; i < size_; ++i) text_[i] = text_[i] == from ? to : text_[i];
   }
 
   // Lets `write(char* room, size_t size)` fill the room with a NUL-terminated text and measures it.
