@@ -5,6 +5,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <array>
 #include <cstring>
 
 #include "platform/platform.h"
@@ -31,11 +32,12 @@ class LibraryFile {
 
   // dlopen() maps a file's segments without asking whether they lie in it: a library that was only
   // copied half would end the process with SIGBUS. It would also wait for ever on a pipe.
-  bool is_whole() const {
+  bool is_whole() {
     struct stat st;
     Header header;
     if (::fstat(descriptor_, &st) != 0 || !S_ISREG(st.st_mode)) return false;
-    if (!read(header, 0) || header.e_phentsize != sizeof(Segment)) return false;
+    front_size_ = ::pread(descriptor_, front_.data(), front_.size(), 0);
+    if (front_size_ < 0 || !read(header, 0) || header.e_phentsize != sizeof(Segment)) return false;
     for (size_t i = 0; i < header.e_phnum; ++i) {
       Segment segment;
       if (!read(segment, header.e_phoff + i * sizeof segment)) return false;
@@ -48,8 +50,12 @@ class LibraryFile {
  private:
   template <class Record>
   bool read(Record& record, Offset offset) const {
-    return ::pread(descriptor_, &record, sizeof record, static_cast<off_t>(offset)) ==
-           static_cast<ssize_t>(sizeof record);
+    constexpr auto size = static_cast<ssize_t>(sizeof record);
+    if (offset < front_.size() && static_cast<ssize_t>(offset) + size <= front_size_) {
+      std::memcpy(&record, front_.data() + offset, sizeof record);
+      return true;
+    }
+    return ::pread(descriptor_, &record, sizeof record, static_cast<off_t>(offset)) == size;
   }
 
   static bool lies_within(const Segment& segment, Offset size) {
@@ -57,6 +63,8 @@ class LibraryFile {
   }
 
   int descriptor_;
+  std::array<char, 1024> front_;  // nearly always holds everything that is read
+  ssize_t front_size_ = 0;
 };
 
 }  // namespace
