@@ -88,15 +88,29 @@ int seek(FILE* stream, int64_t offset, int origin);
 int64_t tell(FILE* stream);
 // Opens for writing, made when missing and not emptied, so that identity can be looked at first.
 FILE* open_unemptied(const char* path);
-bool different_files(FILE* a, FILE* b);  // false also when that cannot be told
-bool empty_file(FILE* stream);           // true also for what has no length, such as a device
+bool empty_file(FILE* stream);
+
+// What a stream leads to.
+struct OpenFile {
+  bool is_folder = false;
+  bool has_content = false;   // that emptying it would remove; a device has none
+  bool has_identity = false;  // in which two streams of one file agree
+  uint64_t device = 0;
+  uint64_t number = 0;
+
+  bool is_same(const OpenFile& other) const {
+    return has_identity && other.has_identity && device == other.device && number == other.number;
+  }
+};
+
+bool look_at(FILE* stream, OpenFile& out);  // false when it cannot be told
 
 // ---- copy.cpp: file contents that the system moves by itself ------------------------------------
 
-// Copies as much of the rest of one file to another as the system does without the bytes passing
-// through the process, which may be nothing; both streams then stand behind it, and the caller
-// copies on. False when a write failed.
-bool copy_within(FILE* from, FILE* to);
+// Copies as much of one file to another as the system does without the bytes passing through the
+// process, which may be nothing; the caller copies on from there. The streams are unbuffered and
+// fresh.
+void copy_within(FILE* from, FILE* to);
 
 // ---- directory.cpp: searches --------------------------------------------------------------------
 

@@ -96,7 +96,6 @@ ZV_FAILING(int, setsockopt, -1, (int fd, int level, int name, const void* value,
 ZV_FAILING(int, getsockopt, -1, (int fd, int level, int name, void* value, socklen_t* size),
            (fd, level, name, value, size))
 ZV_FAILING(int, poll, -1, (struct pollfd * fds, nfds_t count, int timeout), (fds, count, timeout))
-ZV_FAILING(int, fflush, EOF, (FILE * stream), (stream))
 ZV_FAILING(int, fseeko, -1, (FILE * stream, off_t offset, int origin), (stream, offset, origin))
 ZV_FAILING(off_t, ftello, -1, (FILE * stream), (stream))
 

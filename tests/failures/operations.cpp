@@ -98,6 +98,15 @@ int file_copied(Attempt& attempt) {
   return result;
 }
 
+// The system makes the file up as it is read, so it passes through the process.
+int made_up_file_copied(Attempt& attempt) {
+  const ScratchFolder folder;
+  const std::string to = folder.path("to");
+  const int result = attempt([&] { return zv_copy("/proc/version", to.c_str()); });
+  EXPECT_TRUE(result != 0 || folder.content("to").starts_with("Linux"));
+  return result;
+}
+
 int file_copied_onto_itself(Attempt& attempt) {
   const ScratchFolder folder;
   const std::string file = folder.make_file("file", large);
@@ -159,6 +168,7 @@ const Operation read_folder = {"zv_dir_readfirst", 3, folder_read};
 const Operation scan_tree = {"zv_dir_scan", 5, tree_scanned};
 const Operation remove_tree = {"zv_rmpath", 1, tree_removed};
 const Operation copy_file = {"zv_copy of a file", 0, file_copied};
+const Operation copy_made_up = {"zv_copy of a made-up file", 0, made_up_file_copied};
 const Operation copy_onto_itself = {"zv_copy onto itself", -4, file_copied_onto_itself};
 const Operation copy_between_servers = {"zv_copy between servers", 0, relayed};
 

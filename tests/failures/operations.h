@@ -37,6 +37,7 @@ extern const Operation read_folder;           // the iterator, over three entrie
 extern const Operation scan_tree;             // zv_dir_scan() of five entries
 extern const Operation remove_tree;           // zv_rmpath() of the same tree
 extern const Operation copy_file;             // between local files, larger than any buffer
+extern const Operation copy_made_up;          // of a file that has no size
 extern const Operation copy_onto_itself;      // which must leave the file as it is
 extern const Operation copy_between_servers;  // through a temporary file
 Operation copy_along(const scripted::Dialogue& dialogue);

@@ -158,14 +158,18 @@ const Operation locate_file = {"zv_path_locate", 1, file_located};
 std::vector<Row> local_rows() {
   return {
       {copy_file, "fopen fread", EIO, {-3}},
-      {copy_file, "open fdopen fstat ftruncate fwrite fflush fseeko", ENOSPC, {-4}},
-      {copy_file, "open fwrite", EINTR, {-4}},
+      {copy_file, "open fdopen ftruncate", ENOSPC, {-4}},
+      {copy_file, "open", EINTR, {-4}},
+      {copy_file, "fstat", EIO, {-3, -4}},     // of the source, of the destination
       {copy_file, "fclose", ENOSPC, {-4, 0}},  // the destination, then the source
       // What the system does not move by itself is copied block by block.
-      {copy_file, "ftello copy_file_range", EINTR, {0}},
+      {copy_file, "copy_file_range", EINTR, {0}},
       {copy_file, "copy_file_range", EXDEV, {0}},
       {copy_file, "copy_file_range", shortened, {0}},
-      {copy_onto_itself, "fstat", EIO, {-4}},
+      {copy_made_up, "fread", EIO, {-3}},
+      {copy_made_up, "fwrite", ENOSPC, {-4}},
+      {copy_made_up, "fwrite", EINTR, {-4}},
+      {copy_onto_itself, "fstat", EIO, {-3, -4}},
 
       {make_path, "mkdir", ENOSPC, {0}},
       {make_path, "stat", EIO, {1}},  // the making tells what the looking did not

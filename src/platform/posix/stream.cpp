@@ -26,19 +26,19 @@ FILE* open_unemptied(const char* path) {
   return stream;
 }
 
-bool different_files(FILE* a, FILE* b) {
-  struct stat first;
-  struct stat second;
-  return ::fstat(::fileno(a), &first) == 0 && ::fstat(::fileno(b), &second) == 0 &&
-         (first.st_dev != second.st_dev || first.st_ino != second.st_ino);
+bool empty_file(FILE* stream) {
+  return ::ftruncate(::fileno(stream), 0) == 0;
 }
 
-bool empty_file(FILE* stream) {
+bool look_at(FILE* stream, OpenFile& out) {
   struct stat st;
   if (::fstat(::fileno(stream), &st) != 0) return false;
-  // Some file systems write a file out at its close once it was truncated, even from no bytes.
-  if (!S_ISREG(st.st_mode) || st.st_size == 0) return true;
-  return ::ftruncate(::fileno(stream), 0) == 0;
+  out = {.is_folder = S_ISDIR(st.st_mode),
+         .has_content = S_ISREG(st.st_mode) && st.st_size != 0,
+         .has_identity = true,
+         .device = st.st_dev,
+         .number = st.st_ino};
+  return true;
 }
 
 }  // namespace zv::platform

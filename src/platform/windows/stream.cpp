@@ -9,23 +9,6 @@
 
 namespace zv::platform {
 
-namespace {
-
-HANDLE handle_of(FILE* stream) {
-  return reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(stream)));
-}
-
-// A device, a pipe or a console has no identity, and is no file of a disk.
-bool is_on_disk(FILE* stream) {
-  return GetFileType(handle_of(stream)) == FILE_TYPE_DISK;
-}
-
-bool identity(FILE* stream, BY_HANDLE_FILE_INFORMATION& out) {
-  return GetFileInformationByHandle(handle_of(stream), &out) != 0;
-}
-
-}  // namespace
-
 void set_binary(FILE* stream) {
   _setmode(_fileno(stream), _O_BINARY);
 }
@@ -47,21 +30,22 @@ FILE* open_unemptied(const char* path) {
   return stream;
 }
 
-bool different_files(FILE* a, FILE* b) {
-  if (!is_on_disk(a) || !is_on_disk(b)) return true;
-  BY_HANDLE_FILE_INFORMATION first;
-  BY_HANDLE_FILE_INFORMATION second;
-  return identity(a, first) && identity(b, second) &&
-         (first.dwVolumeSerialNumber != second.dwVolumeSerialNumber ||
-          first.nFileIndexHigh != second.nFileIndexHigh ||
-          first.nFileIndexLow != second.nFileIndexLow);
+bool empty_file(FILE* stream) {
+  return _chsize(_fileno(stream), 0) == 0;
 }
 
-bool empty_file(FILE* stream) {
-  const int descriptor = _fileno(stream);
-  struct _stat64 st;
-  if (_fstat64(descriptor, &st) != 0) return false;
-  return (st.st_mode & _S_IFMT) != _S_IFREG || _chsize(descriptor, 0) == 0;
+// A folder is no stream here, and a device, a pipe or a console is no file of a disk.
+bool look_at(FILE* stream, OpenFile& out) {
+  void* const handle = reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(stream)));
+  BY_HANDLE_FILE_INFORMATION found;
+  out = {};
+  if (GetFileType(handle) != FILE_TYPE_DISK) return true;
+  if (GetFileInformationByHandle(handle, &found) == 0) return false;
+  out = {.has_content = (found.nFileSizeHigh | found.nFileSizeLow) != 0,
+         .has_identity = true,
+         .device = found.dwVolumeSerialNumber,
+         .number = uint64_t{found.nFileIndexHigh} << 32 | found.nFileIndexLow};
+  return true;
 }
 
 }  // namespace zv::platform
