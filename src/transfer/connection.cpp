@@ -1,12 +1,20 @@
 #include "transfer/connection.h"
 
+#include <algorithm>
+
 namespace zv {
 
 namespace {
 
-// The platform's answer, unless there is none or it would not hold a reply.
+// The platform's answer, where there is one and it is no small one.
 size_t block_size(int told) {
-  return told < 4096 ? 65536 : static_cast<size_t>(told);
+  return static_cast<size_t>(std::max(told, 65536));
+}
+
+// Whole blocks are read and written: a stream's own buffer would cut each of them in two.
+bool open_unbuffered(const char* path, const char* mode, StreamPtr& file) {
+  file.reset(std::fopen(path, mode));
+  return file != nullptr && std::setvbuf(file.get(), nullptr, _IONBF, 0) == 0;
 }
 
 bool is_directory(const struct _stat64& st) {
@@ -44,8 +52,11 @@ bool open_source(const char* path, StreamPtr& file, int64_t& size) {
   struct _stat64 st;
   if (platform::status(path, &st) != 0 || is_directory(st)) return false;
   size = st.st_size;
-  file.reset(std::fopen(path, "rb"));
-  return file != nullptr;
+  return open_unbuffered(path, "rb", file);
+}
+
+bool open_destination(const char* path, StreamPtr& file) {
+  return open_unbuffered(path, "wb", file);
 }
 
 }  // namespace zv

@@ -77,6 +77,9 @@ struct Connection {
 // The source of an upload: its size, and the file opened for reading. A directory is refused.
 bool open_source(const char* path, StreamPtr& file, int64_t& size);
 
+// The destination of a download, made or emptied.
+bool open_destination(const char* path, StreamPtr& file);
+
 }  // namespace zv
 
 #endif

@@ -1,7 +1,5 @@
 #include "transfer/ftp.h"
 
-#include <cstdio>
-
 #include "transfer/connection.h"
 #include "transfer/dialogue.h"
 #include "transfer/number.h"
@@ -72,8 +70,7 @@ int ftp_download(const platform::Address& addr, unsigned port, const char* user,
                  const char* password, const char* remote, const char* local) {
   Connection connection(Direction::download);
   if (!connection.network.started()) return source_failed;
-  connection.file.reset(std::fopen(local, "wb"));
-  if (connection.file == nullptr) return destination_failed;
+  if (!open_destination(local, connection.file)) return destination_failed;
 
   const Dialogue server(connection);
   int result = connection.open(addr, port);

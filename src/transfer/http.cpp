@@ -58,8 +58,7 @@ int http_get(const platform::Address& addr, unsigned port, const char* user, con
              const char* remote, const char* local) {
   Connection connection(Direction::download);
   if (!connection.network.started()) return source_failed;
-  connection.file.reset(std::fopen(local, "wb"));
-  if (connection.file == nullptr) return destination_failed;
+  if (!open_destination(local, connection.file)) return destination_failed;
 
   LineBuffer authorization;
   int result = connection.open(addr, port);
