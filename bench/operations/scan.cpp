@@ -135,8 +135,8 @@ void measure(Runner& runner) {
     const std::string top = work.path("tree" + std::to_string(files));
     make_tree(top, runner.scaled(files));
     runner.measure(scan_row("scan/all files @" + std::to_string(files), top, {""}));
-    runner.measure(scan_row("scan/*.png among @" + std::to_string(files), top, {"*.png"}));
-    runner.measure(scan_row("scan/*.png in any case, none hidden @" + std::to_string(files), top,
+    runner.measure(scan_row("scan/`*.png` among @" + std::to_string(files), top, {"*.png"}));
+    runner.measure(scan_row("scan/`*.png` in any case, none hidden @" + std::to_string(files), top,
                             {"*.png", true}));
   }
 }
