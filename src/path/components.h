@@ -6,6 +6,7 @@
 #include <string_view>
 
 #include "frame/text_buffer.h"
+#include "frame/text_view.h"
 
 namespace zv {
 
@@ -25,7 +26,7 @@ class Pieces {
 
   // Whether it begins with this component. Cheaper than to look for the first one's end.
   bool begins_with(std::string_view component) const {
-    return root_.empty() && below_.starts_with(component) &&
+    return root_.empty() && has_front(below_, component) &&
            (below_.size() == component.size() || below_[component.size()] == '/');
   }
 

@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <string_view>
 
+#include "frame/text_view.h"
 #include "path/form.h"
 #include "platform/platform.h"
 
@@ -72,7 +73,7 @@ size_t take_dots(const char* component, bool has_front, char* start, char*& end)
 
 bool begins_with_dots(const char* start, const char* end) {
   const std::string_view path(start, static_cast<size_t>(end - start));
-  return path == ".." || path.starts_with("../");
+  return path == ".." || has_front(path, "../");
 }
 
 }  // namespace

@@ -12,6 +12,7 @@
 #include <cstring>
 #include <string_view>
 
+#include "frame/text_view.h"
 #include "strings/search.h"
 #include "zarvo.h"
 
@@ -156,9 +157,7 @@ class Matcher {
   }
 
   // A text that does not end like the pattern cannot match.
-  bool ends_with_tail() const {
-    return std::string_view(text_, text_end_).ends_with(literal_tail(pattern_));
-  }
+  bool ends_with_tail() const { return zv::has_tail({text_, text_end_}, literal_tail(pattern_)); }
 
   // The last run must end where the text does. Where its characters are bytes there, that leaves
   // one place for it.
