@@ -20,7 +20,7 @@ struct Plugins {
   std::vector<std::vector<char*>> formats;
   std::vector<zv_plugin_t> records;
   std::vector<zv_plugin_t*> pointers;
-  std::vector<GPatternSpec*> specs;  // pattern_count for each plugin
+  std::vector<GPatternSpec*> compiled;  // pattern_count for each plugin
 };
 
 void add_entry(Plugins& plugins, const std::vector<std::string>& patterns) {
@@ -28,7 +28,7 @@ void add_entry(Plugins& plugins, const std::vector<std::string>& patterns) {
   for (const std::string& pattern : patterns) {
     entry += pattern + '|';
     const std::string whole = pattern[0] == '.' ? '*' + pattern : pattern;
-    plugins.specs.push_back(g_pattern_spec_new(whole.c_str()));
+    plugins.compiled.push_back(g_pattern_spec_new(whole.c_str()));
   }
   plugins.entries.push_back(entry);
 }
@@ -68,12 +68,13 @@ std::vector<std::string> make_names() {
 }
 
 // What a program with GLib would do: the patterns compiled once, the name in lower case.
-uint64_t first_by_specs(const Plugins& plugins, const std::string& path) {
+uint64_t first_by_compiled(const Plugins& plugins, const std::string& path) {
   char* const base = g_path_get_basename(path.c_str());
   char* const name = g_ascii_strdown(base, -1);
   const size_t length = std::string_view(name).size();
   size_t i = 0;
-  while (i < plugins.specs.size() && !g_pattern_spec_match(plugins.specs[i], length, name, nullptr))
+  while (i < plugins.compiled.size() &&
+         !g_pattern_spec_match(plugins.compiled[i], length, name, nullptr))
     ++i;
   g_free(name);
   g_free(base);
@@ -96,7 +97,7 @@ void add(const char* what, bool wildcards) {
   });
   item.add(what, "GPatternSpec compiled before", [=] {
     uint64_t sum = 0;
-    for (const std::string& name : names) sum += first_by_specs(*plugins, name);
+    for (const std::string& name : names) sum += first_by_compiled(*plugins, name);
     return sum;
   });
 }

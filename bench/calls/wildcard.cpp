@@ -55,9 +55,10 @@ void add(const std::string& what, const std::vector<std::string>& names, const c
   item.add(what, "g_pattern_match_simple", [=] {
     return count(names, [=](const char* name) { return g_pattern_match_simple(pattern, name); });
   });
-  GPatternSpec* const spec = g_pattern_spec_new(pattern);
+  GPatternSpec* const compiled = g_pattern_spec_new(pattern);
   item.add(what, "GPatternSpec compiled before", [=] {
-    return count(names, [=](const char* name) { return g_pattern_spec_match_string(spec, name); });
+    return count(names,
+                 [=](const char* name) { return g_pattern_spec_match_string(compiled, name); });
   });
 }
 
