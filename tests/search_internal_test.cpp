@@ -28,38 +28,28 @@ const Map maps[] = {
     map_with({{'@', '`'}, {'[', 'a'}}),
 };
 
-class Generator {
- public:
-  std::string text(size_t length) {
+TEST(Search, AgreesWithItsDefinition) {
+  std::mt19937 random(11);
+  const auto text_of = [&random](size_t length) {
     constexpr char bytes[] = "aAbBiI[{@`\xC9\xE9\xDD\xFD";
     // Few different bytes make near misses.
-    const size_t kinds = 2 + below(sizeof bytes - 2);
+    const size_t kinds = 2 + random() % (sizeof bytes - 2);
     std::string made;
-    while (made.size() < length) made += bytes[below(kinds)];
+    while (made.size() < length) made += bytes[random() % kinds];
     return made;
-  }
-
-  size_t below(size_t limit) { return random_() % limit; }
-
- private:
-  std::mt19937 random_{11};
-};
-
-TEST(Search, AgreesWithItsDefinition) {
-  Generator generate;
+  };
   int found = 0;
   constexpr int cases = 40000;
   for (int i = 0; i < cases; ++i) {
     // Some needles nearly fit nearly everywhere, which the search notices only after a while.
     const bool hostile = i % 400 == 0;
-    const std::string edge = generate.text(generate.below(40));
+    const std::string edge = text_of(random() % 40);
     const std::string needle = hostile ? std::string(40, 'a') + edge + std::string(60, 'a')
-                                       : generate.text(1 + generate.below(i % 3 == 0 ? 30 : 5));
-    std::string text = generate.text(generate.below(i % 2 == 0 ? 40 : 200));
+                                       : text_of(1 + random() % (i % 3 == 0 ? 30 : 5));
+    std::string text = text_of(random() % (i % 2 == 0 ? 40 : 200));
     if (hostile)
-      text +=
-          std::string(3000 + generate.below(99), 'a') + needle.substr(i % 800 == 0 ? 1 : 0) + text;
-    const Map& lower = maps[generate.below(std::size(maps))];
+      text += std::string(3000 + random() % 99, 'a') + needle.substr(i % 800 == 0 ? 1 : 0) + text;
+    const Map& lower = maps[random() % std::size(maps)];
     const auto folded = [&](std::string s) {
       for (char& ch : s) ch = static_cast<char>(lower[static_cast<unsigned char>(ch)]);
       return s;
