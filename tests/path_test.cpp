@@ -11,148 +11,98 @@
 
 namespace {
 
-struct FormCase {
-  const char* path;
-  const char* forms;  // of "dnxrR": DOS, UNC, UNIX, relative, root
-  int trim_result;
-  const char* trimmed;
-};
-
-TEST(Path, FormsAndTrimming) {
-  const FormCase cases[] = {
-      {"", "r", 0, ""},
-      {"D:", "d", 0, "D:"},
-      {"D:/", "dR", 0, "D:/"},
-      {"D:/x", "d", 0, "D:/x"},
-      {"D:x/", "d", 1, "D:x"},
-      {"D://", "d", 2, "D:"},
-      {"::/", "dR", 0, "::/"},
-      {"/:", "dx", 0, "/:"},
-      {":a", "r", 0, ":a"},
-      {"/", "xR", 0, "/"},
-      {"//", "", 2, ""},
-      {"///", "", 3, ""},
-      {"/a/", "x", 1, "/a"},
-      {"//srv", "", 0, "//srv"},
-      {"//srv/", "", 1, "//srv"},
-      {"//srv//sh", "", 0, "//srv//sh"},
-      {"///srv/sh", "", 0, "///srv/sh"},
-      {"//s/h", "nR", 1, "//s/h/"},
-      {"//srv/sh/", "nR", 0, "//srv/sh/"},
-      {"//srv/sh//", "n", 2, "//srv/sh"},
-      {"//srv/sh/dir/", "n", 1, "//srv/sh/dir"},
-      {"a/b//", "r", 2, "a/b"},
-      {"a\\", "r", 0, "a\\"},
-      {"a", "r", 0, "a"},
-  };
-  for (const FormCase& c : cases) {
-    SCOPED_TRACE(c.path);
-    std::string forms;
-    if (zv_ispath_DOS(c.path) == 1) forms += 'd';
-    if (zv_ispath_UNC(c.path) == 1) forms += 'n';
-    if (zv_ispath_UNIX(c.path) == 1) forms += 'x';
-    if (zv_ispath_relative(c.path) == 1) forms += 'r';
-    if (zv_ispath_root(c.path) == 1) forms += 'R';
-    EXPECT_EQ(forms, c.forms);
-
-    char text[32];
-    std::strcpy(text, c.path);
-    EXPECT_EQ(zv_trim_slash(text), c.trim_result);
-    EXPECT_STREQ(text, c.trimmed);
-
-    const bool grows = *c.path != '\0' && c.path[std::strlen(c.path) - 1] != '/';
-    std::strcpy(text, c.path);
-    EXPECT_EQ(zv_add_slash(text), grows);
-    EXPECT_EQ(text, std::string(c.path) + (grows ? "/" : ""));
-  }
+// Which of these hold, a letter each: DOS, UNC, UNIX, relative, root.
+std::string forms(const char* path) {
+  const struct {
+    int (*holds)(const char*);
+    char letter;
+  } questions[] = {{zv_ispath_DOS, 'd'},
+                   {zv_ispath_UNC, 'n'},
+                   {zv_ispath_UNIX, 'x'},
+                   {zv_ispath_relative, 'r'},
+                   {zv_ispath_root, 'R'}};
+  std::string all;
+  for (const auto& question : questions)
+    if (question.holds(path) == 1) all += question.letter;
+  return all;
 }
 
-struct PieceCase {
-  const char* path;
-  const char* split;  // '|' behind each piece
-  const char* folder;
-  const char* name;
-  const char* extension;
-};
-
+// The pieces, '|' behind each.
 std::string split(const char* path) {
   Guarded text(path, 2);  // the room for two characters more that splitting may take
   zv_split_path(text.data());
-  EXPECT_TRUE(text.intact()) << path;
   std::string pieces;
   for (const char* piece = text.text(); *piece != '\0'; piece += std::strlen(piece) + 1)
     pieces += std::string(piece) + '|';
   return pieces;
 }
 
-TEST(Path, Pieces) {
-  const PieceCase cases[] = {
-      {"", "", "", "", ""},
-      {"name", "name|", "", "name", ""},
-      {"a.txt", "a.txt|", "", "a.txt", ".txt"},
-      {"a.tar.gz", "a.tar.gz|", "", "a.tar.gz", ".gz"},
-      {"name.", "name.|", "", "name.", ""},
-      {".profile", ".profile|", "", ".profile", ""},
-      {"dir/.profile", "dir|.profile|", "dir", ".profile", ""},
-      {"dir/a.b", "dir|a.b|", "dir", "a.b", ".b"},
-      {"a.b/x", "a.b|x|", "a.b", "x", ""},
-      {"a/b/", "a|b|", "a", "b", ""},
-      {"a//b", "a|", "a", "b", ""},
-      {".", ".|", ".", "", ""},
-      {"..", "..|", "..", "", ""},
-      {"a/..", "a|..|", "a/..", "", ""},
-      {"a/./", "a|.|", "a/.", "", ""},
-      {"D:/a/b.txt", "D:/|a|b.txt|", "D:/a", "b.txt", ".txt"},
-      {"D:/a", "D:/|a|", "D:/", "a", ""},
-      {"D:/", "D:/|", "D:/", "", ""},
-      {"D://a", "D:/|", "D:", "a", ""},
-      {"D:", "D:|", "", "D:", ""},
-      {"D:a/b", "D:a|b|", "D:a", "b", ""},
-      {"/", "/|", "/", "", ""},
-      {"/x", "/|x|", "/", "x", ""},
-      {"/usr/x.y/", "/|usr|x.y|", "/usr", "x.y", ""},
-      {"//x", "/|", "", "x", ""},
-      {"//srv/sh", "//srv/sh/|", "//srv/sh/", "", ""},
-      {"//srv/sh//", "//srv/sh/|", "//srv/sh", "", ""},
-      {"//srv/sh/f.c", "//srv/sh/|f.c|", "//srv/sh/", "f.c", ".c"},
-      {"//srv/sh/a/b", "//srv/sh/|a|b|", "//srv/sh/a", "b", ""},
-  };
-  for (const PieceCase& c : cases) {
-    SCOPED_TRACE(c.path);
-    EXPECT_EQ(split(c.path), c.split);
-    char out[32];
-    EXPECT_EQ(zv_extract_directory(c.path, out, sizeof out), *c.folder != '\0');
-    EXPECT_STREQ(out, c.folder);
-    EXPECT_EQ(zv_extract_filename(c.path, out, sizeof out), *c.name != '\0');
-    EXPECT_STREQ(out, c.name);
-    EXPECT_EQ(zv_extract_extension(c.path, out, sizeof out), *c.extension != '\0');
-    EXPECT_STREQ(out, c.extension);
-    EXPECT_STREQ(zv_dot(c.path), *c.extension != '\0' ? c.extension : "");
+// The piece where it fits, where it does not, and in the path's own buffer.
+void expect_piece(int (*extract)(const char*, char*, size_t), const char* path,
+                  const std::string& piece) {
+  for (const size_t size : {piece.size() + 1, std::max<size_t>(piece.size(), 1), size_t{1}}) {
+    Guarded out = Guarded::buffer("", size);
+    EXPECT_EQ(extract(path, out.data(), size), !piece.empty() && size > 1);
+    EXPECT_EQ(out.text(), piece.substr(0, size - 1));
   }
-  const char* const path = "a/b/c";
-  EXPECT_EQ(zv_slash(path), path + 3);
-  EXPECT_EQ(zv_slash("abc")[0], '\0');
+  const auto in_place = [&](char* s) { return extract(s, s, std::strlen(s) + 2); };
+  Guarded own(path, 1);
+  EXPECT_EQ(in_place(own.data()), !piece.empty());
+  EXPECT_EQ(own.text(), piece);
 }
 
-using Extract = int (*)(const char* path, char* out, size_t size);
-
-TEST(Path, OutputIsCutAndMayBeThePathItself) {
+TEST(Path, FormsAndPieces) {
   const struct {
-    Extract extract;
-    const char* whole;
-    const char* cut;
-  } cases[] = {{zv_extract_directory, "dir/sub", "dir"},
-               {zv_extract_filename, "name.text", "nam"},
-               {zv_extract_extension, ".text", ".te"}};
+    const char *path, *forms, *trimmed, *split, *folder, *name, *extension;
+  } cases[] = {
+      {"", "r", "", "", "", "", ""},
+      {"a.tar.gz", "r", "a.tar.gz", "a.tar.gz|", "", "a.tar.gz", ".gz"},
+      {"name.", "r", "name.", "name.|", "", "name.", ""},
+      {".profile", "r", ".profile", ".profile|", "", ".profile", ""},
+      {"dir/.profile", "r", "dir/.profile", "dir|.profile|", "dir", ".profile", ""},
+      {"dir/a.b", "r", "dir/a.b", "dir|a.b|", "dir", "a.b", ".b"},
+      {"a.b/x//", "r", "a.b/x", "a.b|x|", "a.b", "x", ""},
+      {"a//b", "r", "a//b", "a|", "a", "b", ""},
+      {"a\\", "r", "a\\", "a\\|", "", "a\\", ""},
+      {"..", "r", "..", "..|", "..", "", ""},
+      {"a/..", "r", "a/..", "a|..|", "a/..", "", ""},
+      {"a/./", "r", "a/.", "a|.|", "a/.", "", ""},
+      {"D:", "d", "D:", "D:|", "", "D:", ""},
+      {"D:/", "dR", "D:/", "D:/|", "D:/", "", ""},
+      {"D:/a", "d", "D:/a", "D:/|a|", "D:/", "a", ""},
+      {"D://", "d", "D:", "D:|", "", "D:", ""},
+      {"D://a", "d", "D://a", "D:/|", "D:", "a", ""},
+      {"D:a/b/", "d", "D:a/b", "D:a|b|", "D:a", "b", ""},
+      {"::/", "dR", "::/", "::/|", "::/", "", ""},
+      {"/:", "dx", "/:", "/|:|", "/", ":", ""},
+      {":a", "r", ":a", ":a|", "", ":a", ""},
+      {"/", "xR", "/", "/|", "/", "", ""},
+      {"/x", "x", "/x", "/|x|", "/", "x", ""},
+      {"/usr/x.y/", "x", "/usr/x.y", "/|usr|x.y|", "/usr", "x.y", ""},
+      {"//", "", "", "", "", "", ""},
+      {"//x", "", "//x", "/|", "", "x", ""},
+      {"//srv/", "", "//srv", "/|", "", "srv", ""},
+      {"//srv//sh", "", "//srv//sh", "/|", "//srv", "sh", ""},
+      {"//s/h", "nR", "//s/h/", "//s/h/|", "//s/h/", "", ""},
+      {"//srv/sh/", "nR", "//srv/sh/", "//srv/sh/|", "//srv/sh/", "", ""},
+      {"//srv/sh//", "n", "//srv/sh", "//srv/sh/|", "//srv/sh", "", ""},
+      {"//srv/sh/f.c", "n", "//srv/sh/f.c", "//srv/sh/|f.c|", "//srv/sh/", "f.c", ".c"},
+  };
   for (const auto& c : cases) {
-    char text[] = "dir/sub/name.text";
-    char out[4] = "xyz";
-    EXPECT_EQ(c.extract(text, out, sizeof out), 1);
-    EXPECT_STREQ(out, c.cut);
-    EXPECT_EQ(c.extract(text, out, 1), 0);
-    EXPECT_STREQ(out, "");
-    EXPECT_EQ(c.extract(text, text, sizeof text), 1);
-    EXPECT_STREQ(text, c.whole);
+    SCOPED_TRACE(c.path);
+    const std::string path = c.path;
+    EXPECT_EQ(forms(c.path), c.forms);
+    const auto change = static_cast<int>(path.size()) - static_cast<int>(std::strlen(c.trimmed));
+    expect_edit(path, zv_trim_slash, std::abs(change), c.trimmed);
+    const bool grows = !path.empty() && !path.ends_with('/');
+    expect_edit(path, zv_add_slash, grows, path + (grows ? "/" : ""));
+
+    EXPECT_EQ(split(c.path), c.split);
+    expect_piece(zv_extract_directory, c.path, c.folder);
+    expect_piece(zv_extract_filename, c.path, c.name);
+    expect_piece(zv_extract_extension, c.path, c.extension);
+    EXPECT_STREQ(zv_dot(c.path), c.extension);
+    EXPECT_STREQ(zv_slash(c.path), c.path + std::min(path.rfind('/'), path.size()));
   }
 }
 
@@ -162,23 +112,20 @@ TEST(Path, LongPathsAreCut) {
   EXPECT_EQ(zv_extract_filename((folder + "/" + std::string(99, 'n')).c_str(), out, 400), 1);
   EXPECT_EQ(out, std::string(18, 'n'));
   EXPECT_EQ(zv_extract_directory((folder + std::string(50, 'd') + "/n").c_str(), out, 400), 0);
-
   const std::string bare_share = "//s/" + std::string(315, 'h');  // has no room for its separator
   EXPECT_EQ(zv_extract_directory(bare_share.c_str(), out, 400), 0);
   EXPECT_STREQ(out, "");
 }
 
 struct ResolveCase {
-  const char* path;
-  const char* base;
+  const char *path, *base;
   int result;
   const char* out;
 };
 
-using Resolve = int (*)(const char* path, const char* base, char* out, size_t size);
-
 // Also with `out` being the path's own buffer.
-void expect_resolved(Resolve resolve, const ResolveCase& c) {
+void expect_resolved(int (*resolve)(const char*, const char*, char*, size_t),
+                     const ResolveCase& c) {
   SCOPED_TRACE(std::string(c.path) + " against " + c.base);
   char out[64] = "untouched";
   EXPECT_EQ(resolve(c.path, c.base, out, sizeof out), c.result);
@@ -192,10 +139,8 @@ void expect_resolved(Resolve resolve, const ResolveCase& c) {
 TEST(Path, Absolute) {
   const ResolveCase cases[] = {
       {"../lib/x.dll", "D:/app/bin", 1, "D:/app/lib/x.dll"},
-      {"./a/b", "D:/w", 1, "D:/w/a/b"},
       {"", "D:/w", 1, "D:/w"},
       {".", "D:/w/", 1, "D:/w"},
-      {"x", "//srv/sh", 1, "//srv/sh/x"},
       {"..", "//srv/sh/a", 1, "//srv/sh/"},
       {"../..", "//srv/sh/a", 0, ""},
       {"a", "D:/", 1, "D:/a"},
@@ -204,8 +149,6 @@ TEST(Path, Absolute) {
       {"./././a", "D:/w", 1, "D:/w/a"},
       {"a/./b/../d", "D:/w", 1, "D:/w/a/./b/../d"},
       {".././a", "D:/w/v", 1, "D:/w/./a"},
-      {"../..", "D:/a/b", 1, "D:/"},
-      {"../../..", "D:/a/b", 0, ""},
       {"../x", "a/b", 1, "a/x"},
       {"../x", "a", 0, ""},
       {"/x", "D:/w", 1, "D:/w//x"},  // nothing tests for a relative path
@@ -227,13 +170,11 @@ TEST(Path, Relative) {
       {"D:/a", "D:/a/", 1, ""},
       {"D:/", "D:/a", 1, ".."},
       {"D:/ab", "D:/a", 1, "../ab"},
-      {"/x", "/", 1, "x"},
       {"/", "/", 1, ""},
       {"/x/D:", "/x", 1, "D:/"},  // what is left is a root once it is joined
       {"//srv/a/x", "//SRV/b/y", 1, "../../a/x"},
       {"//srv/a", "//srv/b", 1, "../a"},
       {"//srv/a/", "//srv/A", 1, ""},
-      {"//srv/a/x", "//srv/a", 1, "x"},
       {"//srv/a", "//srw/a", 0, "//srv/a"},
       {"//srv/a", "//sr/a", 0, "//srv/a"},
       {"//srv/a", "/srv/a", 0, "//srv/a"},
@@ -259,8 +200,8 @@ TEST(Path, ResolvedAgainstTheWorkingDirectory) {
 }
 
 TEST(Path, ResolvedResultsAreCutOrRefused) {
-  char out[8] = "";
-  EXPECT_EQ(zv_absolute("lib", "/usr/local", out, sizeof out), 1);
+  char out[400] = "";
+  EXPECT_EQ(zv_absolute("lib", "/usr/local", out, 8), 1);
   EXPECT_STREQ(out, "/usr/lo");
   EXPECT_EQ(zv_relative("/usr/local", "/usr/local/lib/x", out, 3), 1);
   EXPECT_STREQ(out, "..");
@@ -269,27 +210,24 @@ TEST(Path, ResolvedResultsAreCutOrRefused) {
   EXPECT_EQ(zv_absolute("lib", "/usr", out, 1), 0);
 
   // 319 characters fit and one more does not, whether it comes from a name or from climbing.
-  std::string base(300, 'b');
-  base[0] = '/';
+  const std::string base = '/' + std::string(299, 'b');
   for (const bool fits : {true, false}) {
     const std::string name(fits ? 18 : 19, 'n');
-    char whole[400] = "untouched";
-    EXPECT_EQ(zv_absolute(name.c_str(), base.c_str(), whole, sizeof whole), fits);
-    EXPECT_EQ(whole, fits ? base + "/" + name : "untouched");
+    std::strcpy(out, "untouched");
+    EXPECT_EQ(zv_absolute(name.c_str(), base.c_str(), out, sizeof out), fits);
+    EXPECT_EQ(out, fits ? base + "/" + name : "untouched");
 
     std::string deep;
     for (int i = 0; i < (fits ? 106 : 107); ++i) deep += "/d";
-    const std::string path = fits ? "/x" : "/y";
-    EXPECT_EQ(zv_relative(path.c_str(), deep.c_str(), whole, sizeof whole), fits);
-    EXPECT_EQ(std::strlen(whole), fits ? 319u : 2u);
+    EXPECT_EQ(zv_relative("/x", deep.c_str(), out, sizeof out), fits);
+    EXPECT_EQ(std::strlen(out), fits ? 319u : 2u);
   }
 
   // The longest list of components there is.
   std::string most = "a";
   while (most.size() < 319) most += "/a";
-  char whole[400];
-  EXPECT_EQ(zv_relative((most + "/cut").c_str(), "a", whole, sizeof whole), 1);
-  EXPECT_EQ(whole, most.substr(2));
+  EXPECT_EQ(zv_relative((most + "/cut").c_str(), "a", out, sizeof out), 1);
+  EXPECT_EQ(out, most.substr(2));
 }
 
 }  // namespace
