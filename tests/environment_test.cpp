@@ -38,16 +38,11 @@ TEST_F(Environment, PutAndGet) {
   EXPECT_EQ(private_values(""), "empty name|");
   EXPECT_EQ(zv_putenv_private(nullptr, "ignored\x1E", 1), 1);
   EXPECT_EQ(private_values("A"), "none");
-}
 
-TEST_F(Environment, EmptyValuesAreKept) {
-  zv_putenv_private("A", "", 0);
-  zv_putenv_private("A", "", 1);
-  zv_putenv_private("A", "b", 1);
+  for (const char* const value : {"", "", "b"}) zv_putenv_private("A", value, 1);
   char* const block = zv_getenv_private("a");
-  EXPECT_EQ(std::string(block, 4), std::string("\0b\0\0", 4));
   zv_putenv_private("A", "changed", 0);
-  EXPECT_STREQ(block + 1, "b");
+  EXPECT_EQ(std::string(block, 4), std::string("\0b\0\0", 4));
   zv_free(block);
 }
 
@@ -59,9 +54,7 @@ TEST_F(Environment, ManyVariables) {
   for (int i = 1; i < count; i += 3) zv_putenv_private(name(i).c_str(), "more", 1);
   for (int i = 0; i < count; ++i) {
     const std::string expected[] = {"none", name(i) + "|more|", name(i) + "|"};
-    std::string other_case = name(i);
-    zv_strupr(other_case.data());
-    ASSERT_EQ(private_values(other_case.c_str()), expected[i % 3]);
+    ASSERT_EQ(private_values("nAME" + std::to_string(i)), expected[i % 3]);
   }
 }
 

@@ -2,34 +2,29 @@
 #include <gtest/gtest.h>
 
 #include <cstring>
-#include <string>
 
 #include "zarvo.h"
 
 namespace {
 
 TEST(Memory, SizeZeroIsARealBlock) {
-  void* const block = zv_malloc(0);
-  ASSERT_NE(block, nullptr);
-  EXPECT_EQ(zv_free(block), 0);
-
-  char* zeroed = static_cast<char*>(zv_calloc(0));
-  ASSERT_NE(zeroed, nullptr);
-  EXPECT_EQ(zeroed[0], 0);
-
   int ok = -1;
-  zeroed = static_cast<char*>(zv_realloc(zeroed, 0, &ok));
+  void* const blocks[] = {zv_malloc(0), zv_calloc(0), zv_realloc(nullptr, 0, &ok),
+                          zv_dalloc("ab", 0), zv_dalloc(nullptr, 16)};
   EXPECT_EQ(ok, 1);
-  zeroed[0] = 'x';
-  EXPECT_EQ(zv_free(zeroed), 0);
+  EXPECT_EQ(*static_cast<char*>(blocks[1]), '\0');
+  EXPECT_EQ(*static_cast<char*>(blocks[3]), 'a');
+  std::memset(blocks[4], 1, 16);
+  for (void* const block : blocks) {
+    *static_cast<char*>(block) = 'x';
+    EXPECT_EQ(zv_free(block), 0);
+  }
   EXPECT_EQ(zv_free(nullptr), 0);
 }
 
 TEST(Memory, FailedResizeKeepsTheBlock) {
   int ok = -1;
-  char* block = static_cast<char*>(zv_realloc(nullptr, 10, &ok));
-  ASSERT_EQ(ok, 1);
-  std::strcpy(block, "kept");
+  char* const block = static_cast<char*>(zv_dalloc("kept", 5));
   volatile size_t too_much = SIZE_MAX / 2;
   EXPECT_EQ(zv_realloc(block, too_much, &ok), block);
   EXPECT_EQ(ok, 0);
@@ -37,29 +32,14 @@ TEST(Memory, FailedResizeKeepsTheBlock) {
   zv_free(block);
 }
 
-TEST(Memory, CopyOfABlock) {
-  char* const copy = static_cast<char*>(zv_dalloc("ab", 0));
-  ASSERT_NE(copy, nullptr);
-  EXPECT_EQ(copy[0], 'a');
-  zv_free(copy);
-
-  char* const room = static_cast<char*>(zv_dalloc(nullptr, 16));
-  ASSERT_NE(room, nullptr);
-  std::memset(room, 1, 16);
-  zv_free(room);
-}
-
-struct VersionCase {
-  const char* text;
-  int major, minor, patch;
-  const char* release;
-};
-
 TEST(Version, Split) {
-  const VersionCase cases[] = {
+  const struct {
+    const char* text;
+    int major, minor, patch;
+    const char* release;
+  } cases[] = {
       {"1.0.0b", 1, 0, 0, "Beta"},
       {"2.5", 2, 5, 0, "Release"},
-      {"3", 3, 0, 0, "Release"},
       {"1.2.3.4", 1, 2, 3, "Release"},
       {"4.1e", 4, 1, 0, "Educational"},
       {"1.0.0B", 1, 0, 0, "Release"},
@@ -69,7 +49,7 @@ TEST(Version, Split) {
       {" -7.x9.2a", -7, 0, 2, "Alpha"},
       {"1.2.000000000000000000000000000d", 1, 2, 0, "Release"},  // the letter is the 32nd character
   };
-  for (const VersionCase& c : cases) {
+  for (const auto& c : cases) {
     SCOPED_TRACE(c.text);
     int major = -9, minor = -9, patch = -9;
     char release[12] = "";
@@ -80,7 +60,6 @@ TEST(Version, Split) {
     EXPECT_STREQ(release, c.release);
     EXPECT_EQ(zv_split_version(c.text, nullptr, nullptr, nullptr, nullptr), 1);
   }
-
   int major = -9;
   char release[12] = "kept";
   EXPECT_EQ(zv_split_version("", &major, nullptr, nullptr, release), 0);
