@@ -42,9 +42,7 @@ class Debian(unittest.TestCase):
     def test_1_applications(self):
         for words in (["--cflags"], ["--libs"]):  # the system's own folders need no mention
             self.assertNotIn("/usr", " ".join(self.installed.pkg_config(*words)))
-        self.assertEqual(self.installed.with_pkg_config(CONSUMER / "consumer.c"), "consumer: ok\n")
-        self.assertEqual(self.installed.static_with_pkg_config(), "consumer: ok\n")
-        self.assertEqual(self.installed.with_cmake(), ["consumer: ok\n"] * 2)
+        self.installed.expect_all_consumers(self)
 
     def test_1_dependencies(self):
         """An application's package finds out by itself what it depends on."""
@@ -60,10 +58,8 @@ class Debian(unittest.TestCase):
         self.assertIn("zv", run("bash", "-c", f"source {completion} && complete -p zv"))
 
     def test_1_examples(self):
-        build = self.installed.root / "examples"
-        run("cmake", "-S", "/usr/share/doc/libzarvo-dev/examples", "-B", build, "-G", "Ninja")
-        run("cmake", "--build", build)
-        self.assertIn("examples/bin/walk\n", run(build / "bin/walk", build, "walk", "1"))
+        programs = self.installed.build_with_cmake(Path("/usr/share/doc/libzarvo-dev/examples"))
+        self.assertIn("bin/walk\n", run(programs / "walk", programs.parent, "walk", "1"))
 
     def test_1_documents(self):
         for section, name, title in (

@@ -1,6 +1,5 @@
 """An installed library, as its users meet it: where pkg-config and CMake find it, and applications
 built against it and run."""
-import re
 import sys
 from pathlib import Path
 
@@ -42,24 +41,29 @@ class Installed:
     def with_pkg_config(self, source):
         return self.run_program(self.compile(source, *self.pkg_config("--cflags", "--libs")))
 
-    def static_with_pkg_config(self):
-        """What the sample application prints when it has the library inside."""
-        program = self.compile(CONSUMER / "consumer.c", "-static",
-                               *self.pkg_config("--static", "--cflags", "--libs"))
-        needed = re.search(rb"libzarvo\.so|zarvo\.dll", program.read_bytes())
-        if needed:
-            raise AssertionError(f"{program} needs {needed[0]}")
-        return self.run_program(program)
-
-    def with_cmake(self, *definitions):
-        """What each program of the sample application prints."""
-        build = self.root / "consumer"
+    def build_with_cmake(self, source, *definitions):
+        """Builds a project that finds the package; gives its folder of programs."""
+        build = self.root / source.name
         toolchain = ["--toolchain", self.toolchain] if self.toolchain else \
             [f"-DCMAKE_C_COMPILER={self.cc}"]
         place = [f"-DCMAKE_PREFIX_PATH={self.prefix}", f"-DCMAKE_FIND_ROOT_PATH={self.prefix}"] \
             if self.prefix else []
-        run("cmake", "--fresh", "-S", CONSUMER, "-B", build, "-G", "Ninja", *place, *toolchain,
+        run("cmake", "--fresh", "-S", source, "-B", build, "-G", "Ninja", *place, *toolchain,
             *definitions)
         run("cmake", "--build", build)
-        return [self.run_program(program) for program in sorted((build / "bin").iterdir())
-                if program.suffix in ("", ".exe")]
+        return build / "bin"
+
+    def expect_all_consumers(self, case):
+        """The sample application in each way that it finds the library, inside it or beside it."""
+        inside = self.compile(CONSUMER / "consumer.c", "-static",
+                              *self.pkg_config("--static", "--cflags", "--libs"))
+        case.assertNotRegex(inside.read_bytes(), rb"libzarvo\.so|zarvo\.dll")
+        case.assertEqual(self.run_program(inside), "consumer: ok\n")
+        case.assertEqual(self.with_pkg_config(CONSUMER / "consumer.c"), "consumer: ok\n")
+        self.expect_cmake_consumers(case)
+
+    def expect_cmake_consumers(self, case, *definitions):
+        programs = self.build_with_cmake(CONSUMER, *definitions)
+        found = [self.run_program(program) for program in programs.iterdir()
+                 if program.suffix in ("", ".exe")]
+        case.assertEqual(found, ["consumer: ok\n"] * 2)

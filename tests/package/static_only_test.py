@@ -8,7 +8,7 @@ import sys
 import unittest
 from pathlib import Path
 
-from installed import CONSUMER, SOURCE, Installed, run
+from installed import SOURCE, Installed, run
 
 
 class StaticOnly(unittest.TestCase):
@@ -21,10 +21,8 @@ class StaticOnly(unittest.TestCase):
         run("cmake", "--install", folder / "build", "--prefix", prefix)
         self.assertEqual([path.name for path in prefix.rglob("*zarvo*")
                           if path.suffix in (".a", ".so", ".dll", ".lib")], ["libzarvo.a"])
-        installed = Installed(folder / "applications", prefix, cc, toolchain, emulator)
-        self.assertEqual(installed.with_pkg_config(CONSUMER / "consumer.c"), "consumer: ok\n")
-        self.assertEqual(installed.static_with_pkg_config(), "consumer: ok\n")
-        self.assertEqual(installed.with_cmake(), ["consumer: ok\n"] * 2)
+        Installed(folder / "applications", prefix, cc, toolchain,
+                  emulator).expect_all_consumers(self)
 
 
 folder = Path(sys.argv[1]).absolute()

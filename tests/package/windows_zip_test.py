@@ -30,25 +30,22 @@ class WindowsZip(unittest.TestCase):
             self.assertIn(b"zarvo.dll", program.read_bytes())
             self.assertEqual(self.installed.run_program(program), "consumer: ok\n")
 
-    def test_pkg_config(self):
-        self.assertEqual(self.installed.with_pkg_config(CONSUMER / "consumer.c"), "consumer: ok\n")
-        self.assertEqual(self.installed.static_with_pkg_config(), "consumer: ok\n")
-
-    def test_cmake(self):
-        """With either import library: zarvo.lib is for compilers that CMake calls MSVC."""
-        for words in ([], ["-DMSVC=1"]):
-            self.assertEqual(self.installed.with_cmake(*words), ["consumer: ok\n"] * 2)
-            commands = (folder / "applications/consumer/build.ninja").read_text()
-            self.assertEqual("lib/zarvo.lib" in commands, bool(words))
+    def test_applications(self):
+        """CMake takes zarvo.lib for compilers that it calls MSVC."""
+        self.installed.expect_all_consumers(self)
+        commands = folder / "applications/consumer/build.ninja"
+        self.assertNotIn("lib/zarvo.lib", commands.read_text())
+        self.installed.expect_cmake_consumers(self, "-DMSVC=1")
+        self.assertIn("lib/zarvo.lib", commands.read_text())
 
     def test_tool(self):
         self.assertEqual(self.installed.run_program(self.prefix / "bin/zv.exe", "--version"),
                          "zv 1.0.0b\n")
 
     def test_sample_host(self):
-        run(sys.executable, SOURCE / "tests/programs/gallery_test.py", "--emulator", emulator,
+        run(sys.executable, SOURCE / "tests/programs/gallery_test.py",
             self.prefix / "bin/gallery.exe", self.prefix / "bin/make_samples.exe",
-            self.prefix / "plugins")
+            self.prefix / "plugins", emulator)
 
 
 package, folder, toolchain, emulator = (Path(word).absolute() for word in sys.argv[1:])

@@ -48,7 +48,6 @@ expect "copy" zv c
 expect "a.png album an other" zv copy a
 expect "a.png album an other" zv path split a
 expect "album an other" zv scan a
-expect "album an other" zv rm ""
 expect "album an other" zv path absolute x --base a
 expect "album" zv plugins img --dir al
 expect "" zv scan album --files a

@@ -2,12 +2,9 @@
 """Compiles and runs every example of the documents: README, the public header's families and, made
 from those, the manual pages of section 3; and the command lines that zv's help and page show.
 
-A block of C is a whole program when it has a main(), a plugin when it has a ZV_PLUGIN_EXPORT, and
-otherwise the body of a main() of C99. It must compile without warnings and end with 0; where it has
-comments `// prints TEXT`, its output is what they say, in their order, spaces and lines aside. It
-runs in a folder with the files that examples name. Hosts of example.com and example.org stand for
-servers on loopback, and the logins in front of them for one that these take; so the test runs
-beside tests/servers/with_servers.
+A block of C that has neither a main() nor a ZV_PLUGIN_EXPORT is the body of a main(). It must end
+with 0 and print what its comments `// prints TEXT` say, spaces and lines aside. Hosts of example.com
+and example.org stand for the servers of tests/servers/with_servers, which the test runs beside.
 
     documents_test.py SOURCE WORK_FOLDER LIBRARY ZV CC [EMULATOR]
 """
@@ -37,7 +34,7 @@ int main(void) {
 CODEC = "int codec_v2(void); int codec_v2(void) { return 2; }\n"
 FILES = {"notes.txt": "first\nsecond\n", "report.pdf": "%PDF", "data/input.txt": "12345",
          "album/a.png": "", "album/b.txt": "", "album/sub/c.jpg": "", "photo.img": "x",
-         "old/album/d.png": "", "cmake": ""}
+         "old/album/d.png": "", "cmake": "", "plugins/readme": "", "codecs/readme": ""}
 COMMANDS = ["", "copy", "scan", "match", "path", "path normalize", "path absolute", "path relative",
             "path split", "path locate", "rm", "plugins", "info"]
 URL = re.compile(r'(ftp|http|smtp)://([^/"]*@)?[a-z.]*example\.(?:com|org)/')
@@ -53,12 +50,6 @@ def on_loopback(match):
         raise unittest.SkipTest(f"without root there is no {scheme} server")
     login = login and f"{given['ZARVO_TEST_USER']}:{given['ZARVO_TEST_PASSWORD']}@"
     return f"{scheme}://{login or ''}127.0.0.1:{port}/"
-
-
-def program_text(block):
-    if re.search(r"\bint main\(", block):
-        return block
-    return FRAME % block if "ZV_PLUGIN_EXPORT" not in block else FRAME.split("int main")[0] + block
 
 
 def run(*command):
@@ -80,33 +71,24 @@ class Documents(unittest.TestCase):
     @classmethod
     def setUpClass(cls):
         shutil.rmtree(work, ignore_errors=True)
-        for name, text in FILES.items():
-            (work / name).parent.mkdir(parents=True, exist_ok=True)
-            (work / name).write_text(text)
-        (work / "plugins").mkdir()
-        (work / "codecs").mkdir()
+        programs.write_files(work, FILES)
         build(CODEC, work / "codecs/fast.dll", "-shared", "-fPIC")
         Path(given["ZARVO_TEST_HTTP_ROOT"], "data.bin").write_text("data")
         cls.families = header.read(source / "include/zarvo.h")[1]
-        cls.blocks = [(family.name, "\n".join(lines))
-                      for family in cls.families for lines in family.examples]
-        plugin, = (block for _, block in cls.blocks if "ZV_PLUGIN_EXPORT" in block)
-        build(program_text(plugin), work / "plugins/img_sample.dll", "-shared", "-fPIC")
+        cls.blocks = ["\n".join(lines) for family in cls.families for lines in family.examples]
+        plugin, = (block for block in cls.blocks if "ZV_PLUGIN_EXPORT" in block)
+        cls.blocks.remove(plugin)
+        build(FRAME.split("int main")[0] + plugin, work / "plugins/img_sample.dll", "-shared", "-fPIC")
         cls.help = {command: run(*emulator, zv, *command.split(), "--help") for command in COMMANDS}
         cls.page = re.sub(r"\\\(aq", "'", (source / "tools/zv/zv.1").read_text().replace("\\-", "-"))
 
     def check(self, block):
-        text = program_text(URL.sub(on_loopback, block))
-        printed = run(*emulator, build(text, work / "example.exe"))
+        text = URL.sub(on_loopback, block)
+        whole = re.search(r"\bint main\(", text)
+        printed = run(*emulator, build(text if whole else FRAME % text, work / "example.exe"))
         expected = re.findall(r"// prints (.*)", block)
         if expected:
             self.assertEqual(printed.split(), " ".join(expected).split(), printed)
-
-    def test_families(self):
-        for name, block in self.blocks:
-            if "ZV_PLUGIN_EXPORT" not in block:
-                with self.subTest(name, block=block):
-                    self.check(block)
 
     def check_command_lines(self, text):
         """Each as a shell runs it."""
@@ -117,12 +99,10 @@ class Documents(unittest.TestCase):
                 run("sh", "-ec", f"zv() {{ {shlex.join([*emulator, str(zv)])} \"$@\"; }}\n"
                     + URL.sub(on_loopback, line))
 
-    def test_help(self):
+    def test_help_and_page_of_the_tool(self):
         for command in COMMANDS[1:]:
             with self.subTest(command):
                 self.check_command_lines(re.split(r"Examples?:\n", self.help[command])[1])
-
-    def test_page_of_the_tool(self):
         self.check_command_lines(re.search(r"(?s)\.SH EXAMPLES\n\.EX\n(.*)\.EE", self.page)[1])
         option = r"--[a-z-]+"
         self.assertEqual(set(re.findall(option, re.sub(r"\\f.", "", self.page))),
@@ -130,13 +110,11 @@ class Documents(unittest.TestCase):
         for command in COMMANDS:
             self.assertIn(command.split(" ")[-1], self.page)
 
-    def test_each_family_has_an_example(self):
-        self.assertEqual([family.name for family in self.families if not family.examples], [])
-
-    def test_readme(self):
+    def test_readme_and_families(self):
         blocks = re.findall(r"```c\n(.*?)```", (source / "README.md").read_text(), flags=re.S)
         self.assertTrue(blocks)
-        for block in blocks:
+        self.assertEqual([family.name for family in self.families if not family.examples], [])
+        for block in blocks + self.blocks:
             with self.subTest(block=block):
                 self.check(block)
 

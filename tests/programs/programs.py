@@ -29,3 +29,10 @@ def run(*command, **more):
 def as_windows(path):
     """A path of this machine as the emulator's programs name it."""
     return "Z:" + str(path).replace("/", "\\")
+
+
+def write_files(folder, texts):
+    """Files by their names below the folder."""
+    for name, text in texts.items():
+        (folder / name).parent.mkdir(parents=True, exist_ok=True)
+        (folder / name).write_text(text)
