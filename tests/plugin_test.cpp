@@ -92,6 +92,7 @@ TEST(Plugin, WhatCannotBeTried) {
       {dir.c_str(), lib, "img", ZV_PLUGIN_E_ARGUMENTS, -1},
       {dir.c_str(), "../img_a.dll", "img", ZV_PLUGIN_E_ARGUMENTS},
       {dir.c_str(), ".\\img_a.dll", "img", ZV_PLUGIN_E_ARGUMENTS},
+      {dir.c_str(), "img_a", "img", ZV_PLUGIN_E_NOT_FOUND},  // no extension is added
       {missing.c_str(), lib, "img", ZV_PLUGIN_E_NOT_FOUND},
       {"/..", lib, "img", ZV_PLUGIN_E_NOT_FOUND},
       {"$ZARVO_NOT_SET", lib, "img", ZV_PLUGIN_E_NOT_FOUND},

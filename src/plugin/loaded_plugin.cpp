@@ -32,12 +32,9 @@ bool library_file(const char* folder, const char* library, PathBuffer& out) {
 LoadedPlugin open_plugin(const char* file, const char* api, int min, int max, int* answer,
                          int* code) {
   LoadedPlugin plugin;
+  *code = ZV_PLUGIN_E_LOAD;
   plugin.library.reset(platform::load_library(file));
-  if (plugin.library == nullptr) {
-    struct _stat64 st;
-    *code = zv_stat(file, &st) != 0 ? ZV_PLUGIN_E_NOT_FOUND : ZV_PLUGIN_E_LOAD;
-    return {};
-  }
+  if (plugin.library == nullptr) return {};
 
   *code = ZV_PLUGIN_E_ENTRY;
   const auto entry = reinterpret_cast<zv_plugin_entry_t>(

@@ -49,6 +49,9 @@ RecordPtr create(const char* dir, const char* lib, const char* api, int min, int
   zv::PathBuffer file;
   if (!zv::canonical_path(dir, folder) || !zv::library_file(folder.c_str(), lib, file))
     return nullptr;
+  // Windows would go on to look for a name without an extension under another one.
+  struct _stat64 st;
+  if (zv_stat(file.c_str(), &st) != 0) return nullptr;
 
   int version = ZV_PLUGIN_E_SILENT;
   zv::LoadedPlugin plugin = zv::open_plugin(file.c_str(), api, min, max, &version, code);
