@@ -25,6 +25,7 @@ const Map maps[] = {
     map_with({}),
     map_with({{0xC9, 0xE9}, {0xC0, 0xE0}}),
     map_with({{'I', 0xFD}, {0xDD, 'i'}}),
+    map_with({{0xDD, 'i'}}),
     map_with({{'@', '`'}, {'[', 'a'}}),
 };
 

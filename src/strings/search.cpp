@@ -43,14 +43,16 @@ class ExactFilter {
 };
 
 // Lets through both forms of an ASCII letter, and every byte above ASCII: only the locale knows
-// about those. Where the locale has a case of its own for ASCII, it lets every byte through.
+// about those. Where the locale has a case of its own for ASCII, or makes ASCII of the byte, it
+// lets every byte through.
 class CaselessFilter {
  public:
-  CaselessFilter(char ch, bool ascii_case) {
+  CaselessFilter(char ch, const int32_t* lower, bool ascii_case) {
     const int byte = byte_of(ch);
     const bool letter = (byte | 0x20) >= 'a' && (byte | 0x20) <= 'z';
-    value_ = filled(!ascii_case ? 0xFF : letter ? byte | 0x20 : byte);
-    ignored_ = filled(!ascii_case ? 0xFF : letter ? 0x20 : 0);
+    const bool any = !ascii_case || (byte >= 0x80 && lower[byte] < 0x80);
+    value_ = filled(any ? 0xFF : letter ? byte | 0x20 : byte);
+    ignored_ = filled(any ? 0xFF : letter ? 0x20 : 0);
   }
   Block operator()(Block bytes) const {
     return reinterpret_cast<Block>((bytes | ignored_) == value_) | bytes;
@@ -207,8 +209,8 @@ const char* find_without_case(std::string_view text, std::string_view needle,
   };
   if (!fill_a_block(text, needle)) return search_each(text, needle.size(), equals);
   const bool ascii_case = has_ascii_case(lower);
-  const auto filter = [needle, ascii_case](size_t i) {
-    return CaselessFilter(needle[i], ascii_case);
+  const auto filter = [needle, lower, ascii_case](size_t i) {
+    return CaselessFilter(needle[i], lower, ascii_case);
   };
   const auto fold = [lower](char ch) { return static_cast<uint64_t>(lower[byte_of(ch)]); };
   return search(text, needle, filter, fold, equals);
