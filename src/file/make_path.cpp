@@ -63,5 +63,5 @@ int zv_mkfile(const char* path) {
     return zv_extract_directory(file.c_str(), room, size) != 0;
   });
   if (has_folder && zv_mkpath(folder.c_str()) == 0) return 0;
-  return zv::StreamPtr(std::fopen(file.c_str(), "wb")) != nullptr;
+  return zv::StreamPtr(platform::open_to_write(file.c_str())) != nullptr;
 }

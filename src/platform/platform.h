@@ -86,8 +86,10 @@ bool names_a_file(std::string_view name);
 void set_binary(FILE* stream);
 int seek(FILE* stream, int64_t offset, int origin);
 int64_t tell(FILE* stream);
-// Opens for writing, made when missing and not emptied, so that identity can be looked at first.
-FILE* open_unemptied(const char* path);
+// Binary, and not inherited by child processes.
+FILE* open_to_read(const char* path);
+FILE* open_to_write(const char* path);   // made or emptied
+FILE* open_unemptied(const char* path);  // made or left, so that identity can be looked at first
 bool empty_file(FILE* stream);
 
 // What a stream leads to.

@@ -12,9 +12,9 @@ size_t block_size(int told) {
 }
 
 // Whole blocks are read and written: a stream's own buffer would cut each of them in two.
-bool open_unbuffered(const char* path, const char* mode, StreamPtr& file) {
-  file.reset(std::fopen(path, mode));
-  return file != nullptr && std::setvbuf(file.get(), nullptr, _IONBF, 0) == 0;
+bool take_unbuffered(FILE* opened, StreamPtr& file) {
+  file.reset(opened);
+  return opened != nullptr && std::setvbuf(opened, nullptr, _IONBF, 0) == 0;
 }
 
 bool is_directory(const struct _stat64& st) {
@@ -52,11 +52,11 @@ bool open_source(const char* path, StreamPtr& file, int64_t& size) {
   struct _stat64 st;
   if (platform::status(path, &st) != 0 || is_directory(st)) return false;
   size = st.st_size;
-  return open_unbuffered(path, "rb", file);
+  return take_unbuffered(platform::open_to_read(path), file);
 }
 
 bool open_destination(const char* path, StreamPtr& file) {
-  return open_unbuffered(path, "wb", file);
+  return take_unbuffered(platform::open_to_write(path), file);
 }
 
 }  // namespace zv

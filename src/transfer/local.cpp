@@ -28,7 +28,7 @@ int copy_contents(FILE* in, FILE* out, char* block) {
 
 int copy_local(const char* source, const char* destination) {
   const HeapPtr<char[]> block(static_cast<char*>(std::malloc(block_size)));
-  const StreamPtr in(std::fopen(source, "rb"));
+  const StreamPtr in(platform::open_to_read(source));
   if (block == nullptr || in == nullptr) return source_failed;
   platform::OpenFile from;
   if (!platform::look_at(in.get(), from) || from.is_folder) return source_failed;

@@ -1,4 +1,4 @@
-// What C streams leave out: 64-bit offsets, identity, opening without emptying.
+// What C streams leave out: 64-bit offsets, identity, opening in other ways.
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -15,6 +15,14 @@ int seek(FILE* stream, int64_t offset, int origin) {
 
 int64_t tell(FILE* stream) {
   return ::ftello(stream);
+}
+
+FILE* open_to_read(const char* path) {
+  return ::fopen(path, "rbe");
+}
+
+FILE* open_to_write(const char* path) {
+  return ::fopen(path, "wbe");
 }
 
 FILE* open_unemptied(const char* path) {

@@ -1,13 +1,27 @@
-// What C streams leave out: 64-bit offsets, identity, opening without emptying.
+// What C streams leave out: 64-bit offsets, identity, opening in other ways.
 #include <fcntl.h>
 #include <io.h>
-#include <stdio.h>
 #include <sys/stat.h>
 #include <windows.h>
+
+#include <cstdio>
 
 #include "platform/platform.h"
 
 namespace zv::platform {
+
+namespace {
+
+HANDLE handle_of(FILE* stream) {
+  return reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(stream)));
+}
+
+FILE* uninherited(FILE* stream) {
+  if (stream != nullptr) SetHandleInformation(handle_of(stream), HANDLE_FLAG_INHERIT, 0);
+  return stream;
+}
+
+}  // namespace
 
 void set_binary(FILE* stream) {
   _setmode(_fileno(stream), _O_BINARY);
@@ -19,6 +33,14 @@ int seek(FILE* stream, int64_t offset, int origin) {
 
 int64_t tell(FILE* stream) {
   return _ftelli64(stream);
+}
+
+FILE* open_to_read(const char* path) {
+  return uninherited(std::fopen(path, "rb"));
+}
+
+FILE* open_to_write(const char* path) {
+  return uninherited(std::fopen(path, "wb"));
 }
 
 FILE* open_unemptied(const char* path) {
@@ -36,7 +58,7 @@ bool empty_file(FILE* stream) {
 
 // A folder is no stream here, and a device, a pipe or a console is no file of a disk.
 bool look_at(FILE* stream, OpenFile& out) {
-  void* const handle = reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(stream)));
+  const HANDLE handle = handle_of(stream);
   BY_HANDLE_FILE_INFORMATION found;
   out = {};
   if (GetFileType(handle) != FILE_TYPE_DISK) return true;
