@@ -48,7 +48,6 @@ class Components {
  public:
   explicit Components(std::string_view path);
 
-  bool empty() const { return size_ == 0; }
   bool has_root() const { return has_root_; }
   size_t size() const { return size_; }
   std::string_view operator[](size_t i) const { return pieces_[i]; }

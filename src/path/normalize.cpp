@@ -1,5 +1,4 @@
 // A path as somebody wrote it, brought into canonical form.
-#include <algorithm>
 #include <cctype>
 #include <cstdlib>
 #include <cstring>

@@ -1,5 +1,4 @@
 // The folders that "PATH" names.
-#include <algorithm>
 #include <cstdlib>
 #include <cstring>
 

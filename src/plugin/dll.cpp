@@ -1,5 +1,4 @@
 // Dynamic libraries by a handle: open, look up a symbol, close.
-#include <cstdint>
 #include <cstring>
 #include <string_view>
 

@@ -1,8 +1,5 @@
 #include "transfer/base64.h"
 
-#include <cstring>
-#include <string_view>
-
 #include "frame/text_buffer.h"
 
 namespace zv {

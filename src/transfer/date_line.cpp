@@ -1,8 +1,6 @@
 #include "transfer/date_line.h"
 
 #include <cstdio>
-#include <cstdlib>
-#include <iterator>
 
 #include "platform/platform.h"
 

@@ -1,6 +1,5 @@
 // A folder of one's own for a short time.
-#include <unistd.h>
-#include <cstdlib>
+#include <stdlib.h>
 
 #include "platform/platform.h"
 
