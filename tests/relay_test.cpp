@@ -85,8 +85,9 @@ TEST(Relay, Refusals) {
   Variable temporary("TMP", folder.path());
   std::vector<const char*> names = {"/", "/..", "/dir/.", "/..%5C..%5Cf", "/a%5Cb"};
 #ifdef _WIN32
-  names.insert(names.end(), {"/f:stream", "/NUL", "/con.txt", "/aux%20.x", "/Com1", "/f.", "/f%20",
-                             "/f?", "/f*", "/f%3C", "/f%22", "/f%7C", "/f%07"});
+  names.insert(names.end(),
+               {"/f:stream", "/NUL", "/con.txt", "/aux%20.x", "/Com1", "/LPT%B9.x", "/conOUT$",
+                "/f.", "/f%20", "/f?", "/f*", "/f%3C", "/f%22", "/f%7C", "/f%07"});
 #endif
   for (const char* const name : names) {
     SCOPED_TRACE(name);

@@ -36,18 +36,28 @@ bool append_random(PathBuffer& path) {
   }) && path.append(name.view());
 }
 
+bool begins_with(std::string_view name, std::string_view device) {
+  return name.size() >= device.size() &&
+         zv_strnicmp(name.data(), device.data(), device.size()) == 0;
+}
+
+// The superscript digits count, in Latin-1 and in UTF-8.
+bool is_port_number(std::string_view text) {
+  if (text.starts_with('\xC2')) text.remove_prefix(1);
+  return text.size() == 1 && ((text[0] >= '1' && text[0] <= '9') || text[0] == '\xB9' ||
+                              text[0] == '\xB2' || text[0] == '\xB3');
+}
+
 // Names that lead to a device, with any extension, in every folder.
 bool is_device(std::string_view name) {
-  constexpr std::string_view devices[] = {"con", "prn", "aux", "nul"};
-  constexpr std::string_view numbered[] = {"com", "lpt"};
+  constexpr std::string_view devices[] = {"con", "prn", "aux", "nul", "conin$", "conout$"};
   std::string_view stem(name.data(), std::min(name.find('.'), name.size()));
   while (stem.ends_with(' ')) stem.remove_suffix(1);
-  const auto is = [stem](std::string_view device) {
-    return zv_strnicmp(stem.data(), device.data(), device.size()) == 0;
-  };
-  if (stem.size() == 3) return std::any_of(std::begin(devices), std::end(devices), is);
-  return stem.size() == 4 && stem[3] >= '1' && stem[3] <= '9' &&
-         std::any_of(std::begin(numbered), std::end(numbered), is);
+  if (begins_with(stem, "com") || begins_with(stem, "lpt"))
+    return is_port_number({stem.data() + 3, stem.size() - 3});
+  return std::any_of(std::begin(devices), std::end(devices), [stem](std::string_view device) {
+    return stem.size() == device.size() && begins_with(stem, device);
+  });
 }
 
 }  // namespace
