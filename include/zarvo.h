@@ -108,8 +108,8 @@ ZV_API void* zv_calloc(size_t size);
  * @param block the block, or NULL for a fresh one.
  * @param size  bytes wanted; 0 counts as 1 and never frees.
  * @param ok    receives 1 on success and 0 on failure.
- * @return on success the block's new address, the old one being no longer valid; on failure
- * `block`.
+ * @return on success the block's new address, the old one being no longer valid; on failure the
+ *         old one.
  * @par Thread safety
  *   Safe from any thread, for distinct blocks.
  */
@@ -320,7 +320,7 @@ ZV_API size_t zv_strnnullcat(char* dst, const char* src, size_t size);
  * @param s the text, edited in place.
  * @return its length now.
  * @par Thread safety
- *   Safe from any thread, for distinct texts.
+ *   Safe from any thread, for distinct texts, while no thread changes the locale.
  */
 ZV_API size_t zv_strltrim(char* s);
 
@@ -330,7 +330,7 @@ ZV_API size_t zv_strltrim(char* s);
  * @param s the text, edited in place.
  * @return its length now.
  * @par Thread safety
- *   Safe from any thread, for distinct texts.
+ *   Safe from any thread, for distinct texts, while no thread changes the locale.
  */
 ZV_API size_t zv_strrtrim(char* s);
 
@@ -340,7 +340,7 @@ ZV_API size_t zv_strrtrim(char* s);
  * @param s the text, edited in place.
  * @return its length now.
  * @par Thread safety
- *   Safe from any thread, for distinct texts.
+ *   Safe from any thread, for distinct texts, while no thread changes the locale.
  */
 ZV_API size_t zv_strtrim(char* s);
 
@@ -1141,9 +1141,9 @@ ZV_API int zv_pathlist(char*** list);
 /**
  * Find a file by its name in the folders of the search path, in their order.
  *
- * Only the last component of the path counts. The working directory is not searched, no extension
- * is added, and a folder of that name counts as found. A candidate of more than 319 characters is
- * passed over.
+ * Only the last component of the path counts; without one, as in a root, the first folder itself is
+ * found. The working directory is not searched, no extension is added, and a folder of that name
+ * counts as found. A candidate of more than 319 characters is passed over.
  *
  * @param path the name, in a buffer of #ZV_PATH_MAX bytes.
  * @return 1 if `path` now names the first that exists; 0 if none does, `path` being unchanged.
@@ -1644,8 +1644,9 @@ ZV_API intptr_t zv_dir_close(intptr_t handle);
 /**
  * List what a folder holds, itself and its parent left out, each folder in front of its content.
  *
- * A folder that is missing or cannot be read holds nothing; that is no failure. A symbolic link is
- * an entry and is never followed, except where `dir` itself is one.
+ * A folder that is missing or cannot be read holds nothing, and one whose reading fails on the way
+ * what was read of it; that is no failure. A symbolic link is an entry and is never followed,
+ * except where `dir` itself is one.
  *
  * @param dir       the folder; empty means the current one.
  * @param list      receives the list, to be given back with zv_strlist_free(); NULL on failure.
@@ -1703,7 +1704,7 @@ ZV_API int zv_dir_select(const char* dir, const char* name, const dirsel_t* sel)
  *
  * @param path the path.
  * @param mode 0 tests that it exists, 2 that it may be written, 4 that it may be read, 6 both. Bit
- * 0 is ignored: whether a file may be run is never tested.
+ *             0 is ignored: whether a file may be run is never tested.
  * @return 0 when the access is possible, -1 when not.
  * @par Thread safety
  *   Safe from any thread.
@@ -1753,7 +1754,7 @@ ZV_API int zv_get_hidden(const char* path);
  * @param path   the path.
  * @param hidden non-zero to set the attribute, 0 to clear it.
  * @return 1 when the attribute now has the wanted value, which costs no write when it had it
- * before; 0 when the path does not exist or the attribute cannot be written.
+ *         before; 0 when the path does not exist or the attribute cannot be written.
  * @par Thread safety
  *   Safe from any thread.
  */
@@ -2063,8 +2064,8 @@ ZV_API int zv_plugin_destroy(zv_plugin_t* rec);
  *
  * @param rec the record, or NULL.
  * @return 1 when the plugin is loaded, which needs its own zv_plugin_unload(); 0 when the library
- * or its entry is not there any more, when the plugin refuses or lacks a field of its descriptor,
- * or for NULL.
+ *         or its entry is not there any more, when the plugin refuses or lacks a field of its
+ *         descriptor, or for NULL.
  * @par Thread safety
  *   Safe from any thread, for distinct records.
  */
@@ -2150,7 +2151,7 @@ ZV_API int zv_plugin_match_vers(int min, int max, int oldest, int newest, int* v
  * @return how many were accepted. Destroy each record, then give the array back with zv_free().
  * @par Thread safety
  *   Safe from any thread, as far as the plugins' entries are. Reports that are made at the same
- * time mix.
+ *   time mix.
  */
 ZV_API int zv_plugin_enumerate(zv_plugin_t*** plugins, const char* api, int min, int max, int keep);
 
@@ -2170,7 +2171,7 @@ ZV_API zv_plugin_t* zv_plugin_get_entry_by_lib(zv_plugin_t** plugins, const char
  *
  * @param entry where a record is held, such as an element of an array; -1 for none.
  * @param buf   receives the name, cut silently to `size` - 1 characters; NULL to ask for its
- * length.
+ *              length.
  * @param size  the buffer's size in bytes.
  * @return how many characters `buf` holds, or the name's length when `buf` is NULL; 0 for -1.
  * @par Thread safety
@@ -2333,15 +2334,16 @@ ZV_API char* zv_fmt_force(const char* entry, char* name);
  * - FTP (RFC 959) is passive, binary and anonymous without a user. The server must tell the size
  *   when it starts to send, and a file of 0 bytes cannot be fetched.
  * - HTTP is 1.0 (RFC 1945): GET and PUT, one request without a `Host` line, no redirects. A
- * response must announce its length, and that must not be 0. A user is sent as Basic credentials.
+ *   response must announce its length, and that must not be 0. A user is sent as Basic
+ *   credentials.
  * - A mail (RFC 5321, RFC 2045) carries the file as an attachment under its own name. It comes from
  *   the location's user when that holds an `@`, else from the local user. A user asks for a login.
  *   Addresses and the file's name stand in the mail as they are: no angle brackets are added and
  *   nothing is quoted or encoded. A recipient with a space or a comma, or a name with a quotation
- * mark or with bytes beyond ASCII, is for the server and the reader to judge.
+ *   mark or with bytes beyond ASCII, is for the server and the reader to judge.
  * - Between two network locations the file goes through a private folder in the temporary folder,
  *   which is removed. The source's file name must be one that a local file can have, without a
- * backslash.
+ *   backslash.
  * - No text adds a command or a header line: CR or LF in the user, password or decoded path of a
  *   network location makes it unusable, and a file with one in its name is not mailed.
  *
