@@ -9,7 +9,7 @@
 static int read_colour(const char* path, img_picture_t* picture) {
   unsigned red, green, blue;
   size_t i, pixels;
-  FILE* const file = fopen(path, "r");
+  FILE* const file = zv_fopen(path, "r", NULL);
   const int fields = file == NULL ? 0
                                   : fscanf(file, "#%2x%2x%2x %4dx%4d", &red, &green, &blue,
                                            &picture->width, &picture->height);

@@ -34,7 +34,8 @@ int64_t size_of(const std::string& path) {
 // the same again does no harm. A destination may have taken what it was given, a mail for one.
 int copy_with_retries(const CopyOptions& options) {
   int result = zv_copy(options.from.c_str(), options.to.c_str());
-  for (int i = 0; i < options.retries && result == -3 && is_network(options.from); ++i)
+  for (int i = 0;
+       i < options.retries && result == ZV_COPY_SOURCE_FAILED && is_network(options.from); ++i)
     result = zv_copy(options.from.c_str(), options.to.c_str());
   return result;
 }
@@ -55,7 +56,7 @@ int copy(const CopyOptions& options) {
   const int result = copy_with_retries(options);
   progress.reset();
   if (result == 0) return done;
-  if (result == -3) {
+  if (result == ZV_COPY_SOURCE_FAILED) {
     if (lacks_temporary_folder(options))
       complain("a copy between two servers needs a temporary folder: set TMP to one");
     complain("cannot get " + options.from);

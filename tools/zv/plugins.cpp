@@ -17,21 +17,21 @@ using PluginPtr = std::unique_ptr<zv_plugin_t, Destroy>;
 
 std::string reason(int code, const PluginsOptions& options) {
   switch (code) {
-    case -9:
+    case ZV_PLUGIN_E_MEMORY:
       return "no memory";
-    case -8:
+    case ZV_PLUGIN_E_ARGUMENTS:
       return "wrong version range";
-    case -7:
+    case ZV_PLUGIN_E_NOT_FOUND:
       return "not found";
-    case -6:
+    case ZV_PLUGIN_E_LOAD:
       return "cannot be loaded";
-    case -5:
+    case ZV_PLUGIN_E_ENTRY:
       return "exports no zv_plugin";
-    case -4:
+    case ZV_PLUGIN_E_API:
       return "does not serve this API";
-    case -2:
+    case ZV_PLUGIN_E_DESCRIPTOR:
       return "its descriptor is not complete";
-    case -1:
+    case ZV_PLUGIN_E_SILENT:
       return "refused without a reason";
     default:
       break;
