@@ -34,9 +34,8 @@ class Cookbook(unittest.TestCase):
 
     def test_usage(self):
         for name in ("big_endian", "find_plugin", "moved", "recent", "report", "retry", "walk"):
-            code, output, message = self.run_program(name)
-            self.assertEqual((code, output), (2, ""), name)
-            self.assertTrue(message.startswith(f"usage: {name} "), message)
+            found = self.run_program(name)
+            self.assertEqual((*found[:2], found[2].split()[:2]), (2, "", ["usage:", name]))
 
     def test_settings(self):
         program = work / "app" / ("settings" + suffix)
@@ -101,11 +100,12 @@ class Cookbook(unittest.TestCase):
     def test_big_endian(self):
         header = struct.pack(">6I", 0x2E736E64, 28, 12, 3, 8000, 2)
         samples = struct.pack(">6h", 1, -2, 300, -32768, 5, 6)
-        (work / "sound").write_bytes(header + b"note" + samples)
-        self.check(0, "8000 Hz, 2 channels, 3 samples in each, loudest 32768\n", "big_endian", "sound")
+        sound = work / "sound"
+        sound.write_bytes(header + b"note" + samples)
+        self.check(0, "8000 Hz, 2 channels, 3 samples in each, loudest 32768\n", "big_endian", sound)
         for other in (header[:20], header[::-1] + samples, header[:12] + bytes(12)):
-            (work / "other").write_bytes(other)
-            self.check(1, "", "big_endian", "other")
+            sound.write_bytes(other)
+            self.check(1, "", "big_endian", sound)
         self.check(1, "", "big_endian", "no-such")
 
     def test_report(self):
