@@ -31,10 +31,10 @@ TEST(FaultMatrix, EveryReplyWithEveryFault) {
   const ScratchFolder folder;
   folder.make_file("file", "hello");
   for (const Dialogue& dialogue : dialogues()) {
-    const int before = open_handles();
+    const int handles = open_handles();
     EXPECT_EQ(copy_against(dialogue, Fault::none, 0, folder), 0) << dialogue.name;
     for (size_t step = 0; step < dialogue.steps.size(); ++step) {
-      const auto& [heard, said, survived] = dialogue.steps[step];
+      const auto& [heard, said, survived, before] = dialogue.steps[step];
       for (const Fault fault : faults) {
         if (said.empty() || survived == never_said) continue;
         if (heard == data_out && fault == Fault::with_next) continue;
@@ -45,7 +45,7 @@ TEST(FaultMatrix, EveryReplyWithEveryFault) {
                   survives ? 0 : dialogue.network_failed());
       }
     }
-    EXPECT_EQ(open_handles(), before) << dialogue.name;
+    EXPECT_EQ(open_handles(), handles) << dialogue.name;
   }
 }
 

@@ -27,24 +27,15 @@ TEST(Location, Network) {
       {"HTTP://127.0.0.1/x", zv::LOC_HTTP, {127, 0, 0, 1}, 80, "", "", "/x"},
       {"ftp://10.0.0.300/f", zv::LOC_FTP, {10, 0, 0, 44}, 21, "", "", "/f"},
       {"sMtP://1.2.3.4/u%40d", zv::LOC_SMTP, {1, 2, 3, 4}, 25, "", "", "/u@d"},
-      {"http://1.2.3.4/", zv::LOC_HTTP, {1, 2, 3, 4}, 80, "", "", "/"},
       {"http://1.2.3.4:abc/f", zv::LOC_HTTP, {1, 2, 3, 4}, 0, "", "", "/f"},
-      {"http://1.2.3.4:65535/f", zv::LOC_HTTP, {1, 2, 3, 4}, 65535, "", "", "/f"},
-      {"http://1.2.3.4:+8x/f", zv::LOC_HTTP, {1, 2, 3, 4}, 8, "", "", "/f"},
-      {"ftp://a@1.2.3.4/f", zv::LOC_FTP, {1, 2, 3, 4}, 21, "a", "", "/f"},
+      {"http://1.2.3.4:+65535x/f", zv::LOC_HTTP, {1, 2, 3, 4}, 65535, "", "", "/f"},
       {"ftp://a:b:x@1.2.3.4/f", zv::LOC_FTP, {1, 2, 3, 4}, 21, "a:b", "x", "/f"},
       {"ftp://a:b:x@1.2.3.4:2121/f", zv::LOC_FTP, {1, 2, 3, 4}, 2121, "a", "b:x", "/f"},
       {"ftp://a@1.2.3.4:2121/f", zv::LOC_FTP, {1, 2, 3, 4}, 2121, "a", "", "/f"},
       {"ftp://:p@1.2.3.4/f", zv::LOC_FTP, {1, 2, 3, 4}, 21, "", "p", "/f"},
       {"smtp://u@d:pw@1.2.3.4/r", zv::LOC_SMTP, {1, 2, 3, 4}, 25, "u@d", "pw", "/r"},
       {"smtp://u%40d@1.2.3.4/r", zv::LOC_SMTP, {1, 2, 3, 4}, 25, "u%40d", "", "/r"},
-      {"http://1.2.3.4.5junk/a?b#c\\d@e:f",
-       zv::LOC_HTTP,
-       {1, 2, 3, 4},
-       80,
-       "",
-       "",
-       "/a?b#c\\d@e:f"},
+      {"http://1.2.3.4.5x/a?b#\\d@e:f", zv::LOC_HTTP, {1, 2, 3, 4}, 80, "", "", "/a?b#\\d@e:f"},
       {"http://1.2.3.4/a%00b%0d%0a", zv::LOC_HTTP, {1, 2, 3, 4}, 80, "", "", "/a"},
       {"http://localhost/x", zv::LOC_HTTP, {127, 0, 0, 1}, 80, "", "", "/x"},
   };
@@ -64,7 +55,6 @@ TEST(Location, Network) {
 TEST(Location, Local) {
   const char* const cases[][2] = {
       {"https://x/y", "https://x/y"},
-      {"mailto:z", "mailto:z"},
       {"file:/x", "file:/x"},
       {"D:\\dir\\a%20b.txt", "D:/dir/a%20b.txt"},
       {"file:///D|/dir/a%20b.txt", "D:/dir/a b.txt"},
@@ -74,6 +64,9 @@ TEST(Location, Local) {
       {"file:///D", "/D"},
       {"file://server/share/f", "server/share/f"},
       {"file://a%5Cb", "a\\b"},
+      {"file://%41%4g%g4%%41%2541%aF%Fa%4", "A%4g%g4%A%41\xaf\xfa%4"},
+      {"file://a%00b", "a"},
+      {"file://%", "%"},
       {"file://%0d%0a", "\r\n"},  // a line end is a character like others in a file's name
       {"file://", ""},
   };
@@ -114,25 +107,6 @@ TEST(Location, LongestText) {
     EXPECT_NE(zv::parse_location(longest.c_str(), location), zv::LOC_NONE);
     EXPECT_EQ(zv::parse_location((longest + "x").c_str(), location), zv::LOC_NONE);
     EXPECT_EQ(zv::parse_location((longest + "xyz").c_str(), location), zv::LOC_NONE);
-  }
-}
-
-TEST(Location, PercentDecode) {
-  const char* const cases[][2] = {{"%41", "A"},
-                                  {"%4", "%4"},
-                                  {"%", "%"},
-                                  {"", ""},
-                                  {"a%41", "aA"},
-                                  {"%2541", "%41"},
-                                  {"%4g%g4", "%4g%g4"},
-                                  {"%%41", "%A"},
-                                  {"x%aFy%Fa", "x\xafy\xfa"},
-                                  {"a%00b", "a"},
-                                  {"%41%4", "A%4"}};
-  for (const auto& [text, decoded] : cases) {
-    std::string work = text;
-    zv::percent_decode(work.data());
-    EXPECT_STREQ(work.c_str(), decoded) << text;
   }
 }
 

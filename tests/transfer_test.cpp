@@ -1,4 +1,4 @@
-// zv_copy() between local files, and from and to an HTTP server that follows a script.
+// zv_copy() between local files, and and from and to an HTTP server.
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -6,24 +6,23 @@
 #include <initializer_list>
 #include <string>
 
-#include "fixtures/scripted_server.h"
+#include "fixtures/dialogue_server.h"
 #include "scratch_folder.h"
 #include "zarvo.h"
 
 namespace {
 
 namespace fs = std::filesystem;
-using Sizes = std::initializer_list<size_t>;
+using scripted::DialogueServer;
+using scripted::Fault;
+using scripted::unasked;
 
-// Nothing stays open behind a test, or behind a part of it.
-struct SameHandles {
-  const int before = scripted::open_handles();
-  ~SameHandles() { EXPECT_EQ(scripted::open_handles(), before); }
-};
-
+// Nothing stays open behind it.
 int copy(const std::string& from, const std::string& to) {
-  const SameHandles same;
-  return zv_copy(from.c_str(), to.c_str());
+  const int before = scripted::open_handles();
+  const int result = zv_copy(from.c_str(), to.c_str());
+  EXPECT_EQ(scripted::open_handles(), before);
+  return result;
 }
 
 std::string pattern(size_t size) {
@@ -34,14 +33,14 @@ std::string pattern(size_t size) {
 
 TEST(CopyLocal, EverySize) {
   const ScratchFolder folder;
-  for (const size_t size : Sizes{0, 1, 511, 512, 513, 65535, 65536, 65537, 300000}) {
+  for (const size_t size : std::initializer_list<size_t>{0, 1, 65535, 65536, 65537, 300000}) {
     SCOPED_TRACE(size);
     const std::string from = folder.make_file("from", pattern(size));
     folder.make_file("to", "what was there before");
     EXPECT_EQ(copy(from, folder.path("to")), 0);
-    EXPECT_EQ(folder.content("to"), pattern(size));
+    EXPECT_TRUE(folder.content("to") == pattern(size));
     EXPECT_EQ(copy("file://" + from, "FILE://" + folder.path("new")), 0);
-    EXPECT_EQ(folder.content("new"), pattern(size));
+    EXPECT_TRUE(folder.content("new") == pattern(size));
     fs::remove(folder.path("new"));
   }
 }
@@ -51,8 +50,7 @@ TEST(CopyLocal, NamesInEveryForm) {
   std::string from = folder.make_file("a b.txt", "x");
   EXPECT_EQ(copy("file://" + folder.path("a%20b.txt"), folder.path("c%20d")), 0);
   EXPECT_TRUE(folder.exists("c%20d"));
-  for (char& ch : from)
-    if (ch == '/') ch = '\\';
+  std::replace(from.begin(), from.end(), '/', '\\');
   EXPECT_EQ(copy(from, folder.path("e")), 0);
   EXPECT_EQ(folder.content("e"), "x");
 }
@@ -96,9 +94,7 @@ TEST(Copy, LocationsThatAreRefused) {
   const ScratchFolder folder;
   const std::string file = folder.make_file("file", "content");
   const std::string closed = "127.0.0.1:" + std::to_string(scripted::closed_port());
-  for (const std::string location :
-       {"", "http://host", "ftp://user@host", "http://3com/f", "http://no-such-host.invalid/f",
-        "http://1.2.3.4:70000/f", "http://1.2.3.4/a%0d%0ab"}) {
+  for (const std::string location : {"", "http://host", "http://no-such-host.invalid/f"}) {
     EXPECT_EQ(copy(location, file), -3) << location;
     EXPECT_EQ(copy(file, location), -4) << location;
     EXPECT_EQ(copy(location, location), -3) << location;
@@ -107,7 +103,6 @@ TEST(Copy, LocationsThatAreRefused) {
   EXPECT_EQ(folder.content("file"), "content");
 
   EXPECT_EQ(copy("http://" + closed + "/f", folder.path("new")), -3);
-  EXPECT_EQ(folder.content("new"), "");
   EXPECT_TRUE(folder.exists("new"));
   EXPECT_EQ(copy(file, "http://" + closed + "/f"), -4);
   EXPECT_EQ(copy("http://" + closed + "/f", folder.path("missing/new")), -4);
@@ -115,78 +110,78 @@ TEST(Copy, LocationsThatAreRefused) {
   EXPECT_EQ(copy(folder.path(), "http://" + closed + "/f"), -3);
 }
 
-// A GET from a server that reads the request, sends what it is given and then closes.
-struct Response {
-  std::string text;
-  int result;
-  std::string content;
-  bool slowly_behind_header = false;
-};
+const std::string ok = "HTTP/1.0 200 OK\r\n";
 
 TEST(HttpGet, EveryResponse) {
-  const SameHandles same;
-  const std::string ok = "HTTP/1.0 200 OK\r\n";
+  struct Case {
+    std::string response;
+    int result;
+    std::string content;
+    std::string slowly = "";  // sent behind the response, byte by byte
+  };
+  const std::string five = "Content-Length: 5\r\n\r\nhello";
   const std::string large = pattern(500000);
-  const Response cases[] = {
-      {ok + "Content-Length: 5\r\n\r\nhello", 0, "hello"},
+  const std::string length = ok + "Content-Length: ";
+  const Case cases[] = {
+      {ok + five, 0, "hello"},
       {"http/1.1 299 x\r\nServer: y\r\ncontent-length: 5\r\n\r\nhello", 0, "hello"},
-      {ok + "Content-Length: 500000\r\n\r\n" + large, 0, large},
-      {ok + "Content-Length: 40\r\n\r\n" + std::string(40, 'x'), 0, std::string(40, 'x'), true},
-      {ok + "Content-Length: 6\r\n\r\nhello", -3, "hello"},
-      {ok + "Content-Length: 4\r\n\r\nhello", -3, "hello"},
-      {ok + "Content-Length: 500001\r\n\r\n" + large, -3, large},
-      {ok + "Content-Length: 0\r\n\r\n", -3, ""},
-      {ok + "Content-Length: -5\r\n\r\nhello", -3, ""},
-      {ok + "Content-Length: 99999999999999999999\r\n\r\nhello", -3, ""},
+      {"HTTP/1.0 200 OK\nServer: y\r\n" + five, 0, "hello"},
+      {"\nHTTP/1.0 204 \r\n" + five, 0, "hello"},
+      {length + "  5 x\r\nContent-Length: 8\r\n\r\nhello", 0, "hello"},
+      {length + "6\r\n\r\na\r\n\r\nb", 0, "a\r\n\r\nb"},
+      {length + "500000\r\n\r\n" + large, 0, large},
+      {length + "40\r\n\r\n", 0, std::string(40, 'x'), std::string(40, 'x')},
+      {length + "6\r\n\r\nhello", -3, "hello"},
+      {length + "4\r\n\r\nhello", -3, "hello"},
+      {length + "500001\r\n\r\n" + large, -3, large},
+      {length + "9223372036854775807\r\n\r\nhello", -3, "hello"},
+      {length + "9223372036854775808\r\n\r\nhello", -3, ""},
+      {length + "0\r\n\r\n", -3, ""},
+      {length + "-5\r\n\r\nhello", -3, ""},
+      {ok + "Content-Length:5\r\n\r\nhello", -3, ""},
+      {ok + "X-" + five, -3, ""},
       {ok + "\r\nhello", -3, ""},
-      {"HTTP/1.0 199 x\r\nContent-Length: 5\r\n\r\nhello", -3, ""},
-      {"HTTP/1.0 300 x\r\nContent-Length: 5\r\n\r\nhello", -3, ""},
-      {"HTTP/1.0 200 OK\r\nContent-Length: 5\r\n", -3, ""},
+      {ok + "Content-Length: 5\r\n", -3, ""},
+      {"HTTP/1.0 199 x\r\n" + five, -3, ""},
+      {"HTTP/1.0 300 x\r\n" + five, -3, ""},
+      {"HTTP/1.0 4294967496 x\r\n" + five, -3, ""},
+      {"HTTP/1.0 OK 200\r\n" + five, -3, ""},
+      {"HTTP/1.0\r\n" + five, -3, ""},
+      {"ICY 200 OK\r\n" + five, -3, ""},
+      {"HTT\r\n\r\n", -3, ""},
+      {"\r\n\r\n", -3, ""},
       {"", -3, ""},
   };
   const ScratchFolder folder;
-  for (const Response& c : cases) {
-    SCOPED_TRACE(c.text.substr(0, 60));
-    scripted::Server server([&c](scripted::Peer& peer) {
-      peer.expect("GET /a b.txt HTTP/1.0\r\n\r\n");
-      const size_t header = c.text.find("\r\n\r\n") + 4;
-      if (!c.slowly_behind_header) return peer.send(c.text);
-      peer.send(c.text.substr(0, header));
-      peer.send_slowly(c.text.substr(header));
-    });
-    const std::string url = server.url("http", "/a%20b.txt");
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.response.substr(0, 60));
+    const Fault fault = c.slowly.empty() ? Fault::none : Fault::bytewise;
+    DialogueServer server({{"GET", c.response}, {unasked, c.slowly}}, fault, 1);
+    const std::string url = server.url("http", "/a%20b.txt", "u:p@");
     EXPECT_EQ(zv_copy(url.c_str(), folder.path("got").c_str()), c.result);
-    EXPECT_EQ(server.outcome(), "");
-    EXPECT_EQ(folder.content("got"), c.content);
+    EXPECT_EQ(server.heard(), "GET /a b.txt HTTP/1.0\r\nAuthorization: Basic dTpw\r\n\r\n");
+    EXPECT_TRUE(folder.content("got") == c.content);
   }
 }
 
-TEST(HttpGet, Requests) {
-  const SameHandles same;
-  const std::string answer = "HTTP/1.0 200 OK\r\nContent-Length: 5\r\n\r\n";
-  struct Case {
-    const char* credentials;
-    std::string header;
-  };
-  const Case cases[] = {{"u:p@", "Authorization: Basic dTpw\r\n"},
-                        {"u@", "Authorization: Basic dQ==\r\n"},
-                        {":p@", ""}};
+// Behind a body that came with its header the server has to close; too much is not waited behind.
+TEST(HttpGet, TheEndOfTheBody) {
   const ScratchFolder folder;
-  for (const Case& c : cases) {
-    scripted::Server server([&](scripted::Peer& peer) {
-      peer.expect("GET /a.txt HTTP/1.0\r\n" + c.header + "\r\n");
-      peer.send(answer + "hello");
-      peer.close();
-    });
-    EXPECT_EQ(
-        zv_copy(server.url("http", "/a.txt", c.credentials).c_str(), folder.path("got").c_str()),
-        0);
-    EXPECT_EQ(server.outcome(), "");
-  }
+  const std::string got = folder.path("got");
+  const auto result_of = [&got](DialogueServer& server) {
+    return zv_copy(server.url("http", "/f").c_str(), got.c_str());
+  };
+  const std::string announced = ok + "Content-Length: 5\r\n\r\n";
+  DialogueServer resets({{"GET", announced + "hello"}, {unasked, ""}}, Fault::reset, 1);
+  EXPECT_EQ(result_of(resets), -3);
+  DialogueServer goes_on({{"GET", announced + "hello"}, {unasked, "!"}});
+  EXPECT_EQ(result_of(goes_on), -3);
+  DialogueServer waits({{"GET", announced + "hello!"}, {scripted::until_closed, ""}});
+  EXPECT_EQ(result_of(waits), -3);
+  EXPECT_EQ(waits.stored(), "closed");
 }
 
 TEST(HttpPut, RequestAndResponse) {
-  const SameHandles same;
   struct Case {
     const char* credentials;
     std::string header;
@@ -196,9 +191,9 @@ TEST(HttpPut, RequestAndResponse) {
   };
   const Case cases[] = {
       {"", "", 5, "HTTP/1.0 201 Created\r\n\r\n", 0},
-      {"", "", 0, "HTTP/1.1 204 No Content\r\n\r\n", 0},
-      {"", "", 1000000, "HTTP/1.0 200 OK\r\nContent-Length: 2\r\n\r\nok", 0},
-      {"u:p@", "Authorization: Basic dTpw\r\n", 5, "HTTP/1.0 201 Created\r\n\r\n", 0},
+      {":p@", "", 0, "HTTP/1.1 204 No Content\r\n\r\n", 0},
+      {"u@", "Authorization: Basic dQ==\r\n", 1000000, "HTTP/1.0 299 OK\r\n\r\nok", 0},
+      {"u:p@", "Authorization: Basic dTpw\r\n", 5, "HTTP/1.0 200 OK\r\n\r\n", 0},
       {"", "", 5, "HTTP/1.0 403 Forbidden\r\n\r\n", -4},
       {"", "", 5, "HTTP/1.0 100 Continue\r\n\r\n", -4},
       {"", "", 5, "", -4},
@@ -208,38 +203,27 @@ TEST(HttpPut, RequestAndResponse) {
     SCOPED_TRACE(c.response);
     const std::string content = pattern(c.size);
     const std::string file = folder.make_file("f", content);
-    scripted::Server server([&](scripted::Peer& peer) {
-      peer.expect("PUT /up/f HTTP/1.0\r\n" + c.header +
-                  "Content-Length: " + std::to_string(c.size) + "\r\n\r\n" + content);
-      peer.send(c.response);
-    });
+    DialogueServer server({{"PUT", ""}, {scripted::body, c.response}});
     EXPECT_EQ(zv_copy(file.c_str(), server.url("http", "/up/f", c.credentials).c_str()), c.result);
-    EXPECT_EQ(server.outcome(), "");
+    EXPECT_EQ(server.heard(), "PUT /up/f HTTP/1.0\r\n" + c.header +
+                                  "Content-Length: " + std::to_string(c.size) + "\r\n\r\n");
+    EXPECT_TRUE(server.stored() == content);
   }
 }
 
 // The longest texts that a location can hold reach the server whole.
 TEST(Http, LongestRequest) {
-  const SameHandles same;
   const ScratchFolder folder;
   const std::string file = folder.make_file("f", "x");
-  std::string path;
-  std::string user;
-  std::string got;
-  scripted::Server server([&got](scripted::Peer& peer) {
-    got = peer.receive_until("\r\n\r\n");
-    got += peer.receive(1);
-    peer.send("HTTP/1.0 200 OK\r\n\r\n");
-  });
+  DialogueServer server({{"PUT", ""}, {scripted::body, ok + "\r\n"}});
   const size_t room = 318 - (server.url("http", "", ":@").size() - 7);
-  user.assign(room / 3, 'u');
-  path.assign("/").append(room - 2 * user.size() - 1, 'p');
+  const std::string user(room / 3, 'u');
+  const std::string path = "/" + std::string(room - 2 * user.size() - 1, 'p');
   const std::string url = server.url("http", path, user + ":" + user + "@");
   ASSERT_EQ(url.size(), 318u + 7);
   EXPECT_EQ(zv_copy(file.c_str(), url.c_str()), 0);
-  EXPECT_EQ(server.outcome(), "");
-  EXPECT_TRUE(got.starts_with("PUT " + path + " HTTP/1.0\r\nAuthorization: Basic dXV1"));
-  EXPECT_TRUE(got.ends_with("\r\nContent-Length: 1\r\n\r\nx"));
+  EXPECT_TRUE(server.heard().starts_with("PUT " + path + " HTTP/1.0\r\nAuthorization: Basic dXV1"));
+  EXPECT_TRUE(server.heard().ends_with("\r\nContent-Length: 1\r\n\r\n"));
 }
 
 }  // namespace

@@ -8,7 +8,7 @@
 #include <string>
 #include <string_view>
 
-#include "fixtures/scripted_server.h"
+#include "fixtures/peer.h"
 
 namespace failing {
 
