@@ -47,7 +47,8 @@ class Blocks {
 };
 
 std::atomic<unsigned long> attempting = 0;  // the thread that may be disturbed; 0 for none
-bool in_scope = false;                      // this and all below are that thread's
+Attempt* attempt = nullptr;                 // this and all below are that thread's
+bool in_scope = false;
 Fault current;
 int left = 0;
 std::string_view met;
@@ -64,6 +65,7 @@ Attempt::Attempt(const Fault& fault, int skipped) {
   left = skipped;
   met = {};
   blocks.clear();
+  attempt = this;
   attempting = this_thread();
 }
 
@@ -95,6 +97,12 @@ bool fails(std::string_view call, bool needs_memory) {
   if (!is_tested(call) && !(needs_memory && is_tested(all_memory))) return false;
   if (!met.empty() || left-- > 0) return false;
   met = call;
+  if (current.error == disturbed) {
+    in_scope = false;
+    attempt->meanwhile();
+    in_scope = true;
+    return false;
+  }
   if (current.error != shortened) errno = current.error;
   return true;
 }

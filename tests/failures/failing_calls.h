@@ -5,6 +5,7 @@
 
 #include <gtest/gtest.h>
 
+#include <functional>
 #include <string>
 #include <string_view>
 
@@ -15,11 +16,13 @@ namespace failing {
 // What happens to one call.
 struct Fault {
   std::string_view call;  // its name, or all_memory
-  int error;              // for errno, or shortened
+  int error;              // for errno, or one of those below
 };
 
 inline constexpr std::string_view all_memory = "memory";  // every call that needs some
 inline constexpr int shortened = -1;  // the call moves half of its bytes, and that is no error
+inline constexpr int disturbed =
+    -2;  // Attempt::meanwhile runs before the call, which then succeeds
 
 // One attempt at something during which one call fails: the first, or the one after `skipped`
 // others.
@@ -36,6 +39,8 @@ class Attempt {
     const Scope scope;
     return call();
   }
+
+  std::function<void()> meanwhile = [] {};  // what another process does
 
   // The call that failed; "" as long as none did.
   std::string_view failed() const;

@@ -121,35 +121,24 @@ int __wrap_connect(int fd, const struct sockaddr* address, socklen_t size) {
   return failed || failing::is_tested("poll") ? done_but_failed(-1, EINTR) : result;
 }
 
-ssize_t __real_send(int fd, const void* data, size_t size, int flags);
-ssize_t __wrap_send(int fd, const void* data, size_t size, int flags) {
-  const bool failed = fails("send");
-  if (failed && !is_shortened()) return lost(fd);
-  return __real_send(fd, data, failed ? half(size) : size, flags);
-}
+// A call that moves bytes, or `less` of them when that is all it is to do.
+#define ZV_MOVING(name, failure, less, parameters, arguments) \
+  ssize_t __real_##name parameters;                           \
+  ssize_t __wrap_##name parameters {                          \
+    const bool failed = fails(#name);                         \
+    if (failed && !is_shortened()) return failure;            \
+    if (failed) size = less;                                  \
+    return __real_##name arguments;                           \
+  }
 
-ssize_t __real_recv(int fd, void* room, size_t size, int flags);
-ssize_t __wrap_recv(int fd, void* room, size_t size, int flags) {
-  const bool failed = fails("recv");
-  if (failed && !is_shortened()) return lost(fd);
-  return __real_recv(fd, room, failed ? 1 : size, flags);
-}
-
-ssize_t __real_pread(int fd, void* room, size_t size, off_t offset);
-ssize_t __wrap_pread(int fd, void* room, size_t size, off_t offset) {
-  const bool failed = fails("pread");
-  if (failed && !is_shortened()) return -1;
-  return __real_pread(fd, room, failed ? half(size) : size, offset);
-}
-
-ssize_t __real_copy_file_range(int in, off_t* from, int out, off_t* to, size_t size,
-                               unsigned flags);
-ssize_t __wrap_copy_file_range(int in, off_t* from, int out, off_t* to, size_t size,
-                               unsigned flags) {
-  const bool failed = fails("copy_file_range");
-  if (failed && !is_shortened()) return -1;
-  return __real_copy_file_range(in, from, out, to, failed ? 1000 : size, flags);
-}
+ZV_MOVING(send, lost(fd), half(size), (int fd, const void* data, size_t size, int flags),
+          (fd, data, size, flags))
+ZV_MOVING(recv, lost(fd), 1, (int fd, void* room, size_t size, int flags), (fd, room, size, flags))
+ZV_MOVING(pread, -1, half(size), (int fd, void* room, size_t size, off_t offset),
+          (fd, room, size, offset))
+ZV_MOVING(copy_file_range, -1, 1000,
+          (int in, off_t* from, int out, off_t* to, size_t size, unsigned flags),
+          (in, from, out, to, size, flags))
 
 // Streams move half before they fail.
 size_t __real_fread(void* room, size_t size, size_t count, FILE* stream);
