@@ -14,7 +14,6 @@
 namespace {
 
 namespace fs = std::filesystem;
-using Sizes = std::initializer_list<size_t>;
 
 std::string set(const char* name) {
   const char* const value = std::getenv((std::string("ZARVO_TEST_") + name).c_str());
@@ -47,11 +46,14 @@ std::string bytes(size_t size) {
 struct Place {
   const char* name;
   std::string url;
-  std::string folder;
-  bool takes_empty = true;
+  fs::path folder;
 
   std::string location(const std::string& file) const { return url + file; }
-  fs::path path(const std::string& file) const { return fs::path(folder) / file; }
+  fs::path path(const std::string& file) const { return folder / file; }
+  void put(const std::string& file, const std::string& data) const {
+    std::ofstream(path(file), std::ios::binary) << data;
+    fs::permissions(path(file), fs::perms(0644));
+  }
 };
 
 std::string host(const char* scheme, const char* port, const std::string& login = "") {
@@ -91,8 +93,7 @@ void check_route(const Place& source, const Place& destination, size_t size) {
   const std::string sent = file + ".in";
   const std::string got = file + ".out";
   const std::string data = bytes(size);
-  std::ofstream(source.path(sent), std::ios::binary) << data;
-  fs::permissions(source.path(sent), fs::perms(0644));
+  source.put(sent, data);
   EXPECT_EQ(copy(source.location(sent), destination.location(got)), 0);
   EXPECT_TRUE(content(destination.path(got)) == data);
   fs::remove(source.path(sent));
@@ -102,8 +103,7 @@ void check_route(const Place& source, const Place& destination, size_t size) {
 TEST(Servers, EveryRouteAndSize) {
   for (const Place& source : places()) {
     for (const Place& destination : places()) {
-      for (const size_t size : Sizes{1, 511, 512, 513, (1 << 20) + 1})
-        check_route(source, destination, size);
+      for (const size_t size : {1u, 512u, (1u << 20) + 1}) check_route(source, destination, size);
       if (source.url.starts_with("/")) check_route(source, destination, 0);
     }
   }
@@ -118,20 +118,16 @@ TEST(Servers, LargeFilesBothWays) {
   }
 }
 
-struct Mail {
-  const char* port;
-  bool logged_in;
-};
-
-void check_mail(const Place& source, const Mail& mail, size_t size) {
-  SCOPED_TRACE(std::string(source.name) + " to " + mail.port + ", " + std::to_string(size));
-  const std::string recipient = std::to_string(size) + "@" + mail.port;
+// The port's name is also a recipient's domain.
+void check_mail(const Place& source, const std::string& port, size_t size) {
+  SCOPED_TRACE(std::string(source.name) + " to " + port + ", " + std::to_string(size));
+  const std::string recipient = std::to_string(size) + "@" + port;
   const std::string name = std::to_string(size) + ".bin";
   const std::string data = bytes(size);
-  std::ofstream(source.path(name), std::ios::binary) << data;
-  fs::permissions(source.path(name), fs::perms(0644));
-  const std::string to = host("smtp", mail.port, mail.logged_in ? login() : "") + "/" +
-                         std::to_string(size) + "%40" + mail.port;
+  source.put(name, data);
+  const std::string user = port == "SMTP_PORT" ? "" : login();
+  const std::string to =
+      host("smtp", port.c_str(), user) + "/" + std::to_string(size) + "%40" + port;
   EXPECT_EQ(copy(source.location(name), to), 0);
   const fs::path kept = fs::path(set("MAIL_DIR")) / recipient;
   EXPECT_TRUE(content(kept / "attachment") == data);
@@ -142,12 +138,9 @@ void check_mail(const Place& source, const Mail& mail, size_t size) {
 
 TEST(Servers, MailOfEverySizeAndLogin) {
   const Place local = places().front();
-  const Mail mails[] = {{"SMTP_PORT", false}, {"SMTP_LOGIN_PORT", true}, {"SMTP_PLAIN_PORT", true}};
-  for (const Mail& mail : mails) {
-    for (const size_t size : Sizes{0, 1, 47, 48, 49, 511, 512, 513}) check_mail(local, mail, size);
-    check_mail(local, mail, (1 << 20) + 1);
-  }
-  for (const Place& source : places()) check_mail(source, mails[0], 100);
+  for (const char* const port : {"SMTP_PORT", "SMTP_LOGIN_PORT", "SMTP_PLAIN_PORT"})
+    for (const size_t size : {0u, 1u, 47u, 48u, 49u, (1u << 20) + 1}) check_mail(local, port, size);
+  for (const Place& source : places()) check_mail(source, "SMTP_PORT", 100);
 
   const std::string refused = host("smtp", "SMTP_PORT", login()) + "/a%40b";
   std::ofstream(local.path("file")) << "x";
