@@ -15,7 +15,11 @@
 #include <sys/stat.h>
 #include <sys/types.h>
 
-#if defined(__GNUC__) && !defined(_WIN32)
+/* A program that links zarvo.dll may define ZARVO_DLL, as zarvo::zarvo does for CMake's: calls go
+ * straight into the library, and a function's address is the same as within it. */
+#if defined(_WIN32) && defined(ZARVO_DLL)
+#define ZV_API __declspec(dllimport)
+#elif defined(__GNUC__) && !defined(_WIN32)
 #define ZV_API __attribute__((visibility("default")))
 #else
 #define ZV_API

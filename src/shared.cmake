@@ -11,6 +11,7 @@ set_target_properties(zarvo PROPERTIES
 target_link_libraries(zarvo PRIVATE zarvo_hardening)
 
 if(WIN32)
+  target_compile_definitions(zarvo INTERFACE ZARVO_DLL)
   set_target_properties(zarvo PROPERTIES PREFIX "" IMPORT_PREFIX "lib" DLL_NAME_WITH_SOVERSION OFF)
   enable_language(RC)
   configure_file(version.rc.in version.rc @ONLY)

@@ -51,6 +51,15 @@ TEST(Library, Open) {
   }
 }
 
+// What a program takes for the library's filter must be what the library takes for it: only then
+// does a scan know that it need not ask again for what it has just read.
+TEST(Library, AddressesAreTheLibrarysOwn) {
+  void* const library = zv_dll_open(ZARVO_LIBRARY, 1);
+  EXPECT_EQ(zv_dll_getptr(library, "zv_dir_select", nullptr),
+            reinterpret_cast<void*>(zv_dir_select));
+  EXPECT_EQ(zv_dll_close(library), no_library);
+}
+
 TEST(Library, SymbolsAndTheirDecoration) {
   const PluginFolder folder;
   take_events();

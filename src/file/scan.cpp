@@ -48,8 +48,7 @@ class Scan {
 
   bool wanted(const char* dir, const platform::Entry& entry) const {
     if (options_.filter != nullptr) return options_.filter(dir, entry.name, options_.user) != 0;
-    return options_.selection == nullptr ||
-           selects(*options_.selection, dir, entry.name, entry.kind);
+    return options_.selection == nullptr || selects(*options_.selection, dir, entry);
   }
 
   bool descend(const Search& parent) {

@@ -8,6 +8,7 @@
 
 namespace platform = zv::platform;
 using platform::EntryKind;
+using platform::Hidden;
 
 namespace {
 
@@ -78,25 +79,29 @@ EntryKind kind_behind(const char* path, EntryKind kind) {
   return (st.st_mode & kind_mask) == directory_kind ? EntryKind::directory : EntryKind::other;
 }
 
+bool is_hidden(const char* path, Hidden hidden) {
+  return hidden == Hidden::unknown ? platform::is_hidden(path) : hidden == Hidden::yes;
+}
+
 }  // namespace
 
-bool zv::selects(const dirsel_t& sel, const char* dir, const char* name, EntryKind kind) {
-  const Matcher matcher(name, sel.match_case != 0);
+bool zv::selects(const dirsel_t& sel, const char* dir, const platform::Entry& entry) {
+  const Matcher matcher(entry.name, sel.match_case != 0);
   const bool as_directory =
-      kind != EntryKind::other && matcher.matches_one_of(sel.dir_patterns, sel.separators);
-  const bool as_file =
-      kind != EntryKind::directory && matcher.matches_one_of(sel.file_patterns, sel.separators);
+      entry.kind != EntryKind::other && matcher.matches_one_of(sel.dir_patterns, sel.separators);
+  const bool as_file = entry.kind != EntryKind::directory &&
+                       matcher.matches_one_of(sel.file_patterns, sel.separators);
   if (!as_directory && !as_file) return false;
 
   zv::PathBuffer path;
-  if (!join(path, dir, name)) return false;
-  kind = kind_behind(path.c_str(), kind);
+  if (!join(path, dir, entry.name)) return false;
+  const EntryKind kind = kind_behind(path.c_str(), entry.kind);
   if (kind == EntryKind::unknown || !(kind == EntryKind::directory ? as_directory : as_file))
     return false;
-  return sel.show_hidden != 0 || !platform::is_hidden(path.c_str());
+  return sel.show_hidden != 0 || !is_hidden(path.c_str(), entry.hidden);
 }
 
 int zv_dir_select(const char* dir, const char* name, const dirsel_t* sel) {
   if (name == nullptr || *name == '\0') return 0;
-  return sel == nullptr || zv::selects(*sel, dir, name, EntryKind::unknown);
+  return sel == nullptr || zv::selects(*sel, dir, {name, EntryKind::unknown});
 }

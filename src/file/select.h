@@ -7,8 +7,8 @@
 
 namespace zv {
 
-// zv_dir_select() for a name that is not empty. An entry whose kind is known needs no status call.
-bool selects(const dirsel_t& sel, const char* dir, const char* name, platform::EntryKind kind);
+// zv_dir_select() for a name that is not empty. What its search told of the entry needs no call.
+bool selects(const dirsel_t& sel, const char* dir, const platform::Entry& entry);
 
 }  // namespace zv
 

@@ -117,10 +117,12 @@ void copy_within(FILE* from, FILE* to);
 // ---- directory.cpp: searches --------------------------------------------------------------------
 
 enum class EntryKind { unknown, directory, link, other };
+enum class Hidden { unknown, no, yes };
 
 struct Entry {
   const char* name;  // valid until the next entry is asked for
   EntryKind kind;    // of the entry itself: a link is a link
+  Hidden hidden = Hidden::unknown;
 };
 
 constexpr intptr_t no_search = -1;

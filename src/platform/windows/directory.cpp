@@ -49,6 +49,11 @@ EntryKind kind_of_found(const Search& search) {
   return kind_of(path.c_str(), attributes);
 }
 
+Entry entry_of(Search& search) {
+  const bool hidden = (search.found.attrib & FILE_ATTRIBUTE_HIDDEN) != 0;
+  return {search.found.name, kind_of_found(search), hidden ? Hidden::yes : Hidden::no};
+}
+
 bool begin(Search& search, const char* directory) {
   TextBuffer<ZV_PATH_MAX + 2> pattern;
   if (!search.folder.append(directory)) return false;
@@ -66,7 +71,7 @@ intptr_t search_first(const char* directory, Entry& entry) {
   if (block == nullptr) return no_search;
   auto* const search = new (block.get()) Search;
   if (!begin(*search, directory)) return no_search;
-  entry = {search->found.name, kind_of_found(*search)};
+  entry = entry_of(*search);
   return reinterpret_cast<intptr_t>(block.release());
 }
 
@@ -77,7 +82,7 @@ intptr_t search_below(intptr_t, const char*, const char* path, Entry& entry) {
 bool search_next(intptr_t search, Entry& entry) {
   Search& going = search_of(search);
   if (_findnext64(going.handle, &going.found) != 0) return false;
-  entry = {going.found.name, kind_of_found(going)};
+  entry = entry_of(going);
   return true;
 }
 
