@@ -3,6 +3,7 @@
 #include "path/components.h"
 #include "path/form.h"
 #include "platform/platform.h"
+#include "strings/search.h"
 #include "zarvo.h"
 
 namespace platform = zv::platform;
@@ -33,10 +34,15 @@ bool make_folder(const char* path) {
   return platform::make_directory(path) == 0 || exists(path);
 }
 
+// One call tells it of most paths, before they are taken apart. Not of one with "..", which a
+// platform may read in the text alone: it tells nothing about what stands before that.
+bool is_made(const zv::PathBuffer& path) {
+  return zv::find(path.view(), "..") == nullptr && exists(path.c_str());
+}
+
 bool make_folders(const zv::Components& pieces) {
   zv::PathBuffer prefix;
-  // What exists tells that everything in front of it does, so the search for it starts at the end;
-  // but a platform that reads ".." in the text alone tells nothing about what stands before that.
+  // What exists tells that everything in front of it does, so the search for it starts at the end.
   size_t made = 0;
   while (made < pieces.size() && pieces[made] != "..") ++made;
   for (; made > 0; --made) {
@@ -52,7 +58,8 @@ bool make_folders(const zv::Components& pieces) {
 
 int zv_mkpath(const char* path) {
   zv::PathBuffer text;
-  return take_path(path, text) && make_folders(zv::Components(text.view()));
+  if (!take_path(path, text)) return 0;
+  return is_made(text) || make_folders(zv::Components(text.view()));
 }
 
 int zv_mkfile(const char* path) {
