@@ -122,7 +122,7 @@ TEST(HttpGet, EveryResponse) {
     std::string slowly = "";  // sent behind the response, byte by byte
   };
   const std::string five = "Content-Length: 5\r\n\r\nhello";
-  const std::string large = pattern(500000);
+  const std::string large = pattern(1500000);
   const std::string length = ok + "Content-Length: ";
   const Case cases[] = {
       {ok + five, 0, "hello"},
@@ -131,11 +131,11 @@ TEST(HttpGet, EveryResponse) {
       {"\nHTTP/1.0 204 \r\n" + five, 0, "hello"},
       {length + "  5 x\r\nContent-Length: 8\r\n\r\nhello", 0, "hello"},
       {length + "6\r\n\r\na\r\n\r\nb", 0, "a\r\n\r\nb"},
-      {length + "500000\r\n\r\n" + large, 0, large},
+      {length + "1500000\r\n\r\n" + large, 0, large},
       {length + "40\r\n\r\n", 0, std::string(40, 'x'), std::string(40, 'x')},
       {length + "6\r\n\r\nhello", -3, "hello"},
       {length + "4\r\n\r\nhello", -3, "hello"},
-      {length + "500001\r\n\r\n" + large, -3, large},
+      {length + "1500001\r\n\r\n" + large, -3, large},
       {length + "9223372036854775807\r\n\r\nhello", -3, "hello"},
       {length + "9223372036854775808\r\n\r\nhello", -3, ""},
       {length + "0\r\n\r\n", -3, ""},

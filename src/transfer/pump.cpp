@@ -18,10 +18,12 @@ size_t piece_of(int64_t count, size_t size) {
   return static_cast<size_t>(std::clamp<int64_t>(count, 0, static_cast<int64_t>(size)));
 }
 
-// Receives behind the bytes that the block has until it is full, so that whole blocks are written,
-// or holds the count. False when the peer closed or the connection failed.
+// Receives behind the bytes that the block has until it holds the count, or enough to be worth a
+// write: to wait for more would keep what comes slowly out of the file. False when the peer closed
+// or the connection failed.
 bool fill_block(platform::Socket socket, std::span<char> block, int64_t count, size_t& have) {
-  while (have < block.size() && static_cast<int64_t>(have) < count) {
+  const size_t enough = std::min<size_t>(block.size(), 64 * 1024);
+  while (have < enough && static_cast<int64_t>(have) < count) {
     const std::span<char> room = block.last(block.size() - have);
     const int64_t received = platform::socket_receive(socket, room.data(), room.size());
     if (received <= 0) return false;
