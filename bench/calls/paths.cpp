@@ -37,6 +37,12 @@ Paths make_paths(bool absolute) {
   return paths;
 }
 
+Paths tidied(const Paths& untidy) {
+  Paths paths;
+  for (const std::string& path : untidy) paths.push_back(fs::path(path).lexically_normal());
+  return paths;
+}
+
 // How many characters the results have together: no path may be left out, nor its result.
 template <class Size>
 uint64_t sum(const Paths& paths, Size size) {
@@ -99,8 +105,7 @@ void add_normalize(const Paths& paths, apr_pool_t* pool) {
 
 // Only what is clean before can be compared: we make it absolute, and the others clean it too.
 void add_absolute(const Paths& untidy, apr_pool_t* pool) {
-  Paths paths;
-  for (const std::string& path : untidy) paths.push_back(fs::path(path).lexically_normal());
+  const Paths paths = tidied(untidy);
   const char* const what = "absolute";
   item.add(what, "zarvo", [=] {
     return sum(paths, [](const std::string& path) {
@@ -122,8 +127,7 @@ void add_absolute(const Paths& untidy, apr_pool_t* pool) {
 }
 
 void add_relative(const Paths& untidy) {
-  Paths paths;
-  for (const std::string& path : untidy) paths.push_back(fs::path(path).lexically_normal());
+  const Paths paths = tidied(untidy);
   item.add("relative", "zarvo", [=] {
     return sum(paths, [](const std::string& path) {
       char text[ZV_PATH_MAX];
@@ -141,8 +145,7 @@ void add_relative(const Paths& untidy) {
 
 // Splits relative paths, whose pieces everybody counts alike.
 void add_split(const Paths& untidy) {
-  Paths paths;
-  for (const std::string& path : untidy) paths.push_back(fs::path(path).lexically_normal());
+  const Paths paths = tidied(untidy);
   item.add("split", "zarvo", [=] {
     return sum(paths, [](const std::string& path) {
       char text[ZV_PATH_MAX + 2];
@@ -170,8 +173,7 @@ void add_split(const Paths& untidy) {
 }
 
 void add_pieces(const Paths& untidy) {
-  Paths paths;
-  for (const std::string& path : untidy) paths.push_back(fs::path(path).lexically_normal());
+  const Paths paths = tidied(untidy);
   const char* const what = "directory, name and extension";
   item.add(what, "zarvo", [=] {
     return sum(paths, [](const std::string& path) {
