@@ -22,7 +22,8 @@ size_t piece_of(int64_t count, size_t size) {
 // write: to wait for more would keep what comes slowly out of the file. False when the peer closed
 // or the connection failed.
 bool fill_block(platform::Socket socket, std::span<char> block, int64_t count, size_t& have) {
-  const size_t enough = std::min<size_t>(block.size(), 64 * 1024);
+  constexpr size_t worth_a_write = 65536;
+  const size_t enough = std::min(block.size(), worth_a_write);
   while (have < enough && static_cast<int64_t>(have) < count) {
     const std::span<char> room = block.last(block.size() - have);
     const int64_t received = platform::socket_receive(socket, room.data(), room.size());
