@@ -1,8 +1,12 @@
-# The Debian packages: libzarvo1, what applications run with; libzarvo-dev, what they are built
-# with; zv, the tool. The version sorts before the release that follows the beta.
+# The Debian packages: libzarvo1, what applications run with; libzarvo-tls1, what it loads for
+# encrypted transfers; libzarvo-dev, what applications are built with; zv, the tool. The version
+# sorts before the release that follows the beta.
+if(NOT TARGET zarvo_tls)
+  message(FATAL_ERROR "libzarvo-tls1 needs OpenSSL 3 with its headers, which is not here")
+endif()
 set(CPACK_GENERATOR DEB)
 set(CPACK_DEB_COMPONENT_INSTALL ON)
-set(CPACK_COMPONENTS_ALL library development tool)
+set(CPACK_COMPONENTS_ALL library encryption development tool)
 set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
 set(CPACK_DEBIAN_PACKAGE_VERSION ${PROJECT_VERSION}~beta)
@@ -26,6 +30,15 @@ set(CPACK_DEBIAN_LIBRARY_DESCRIPTION "portable utility functions - shared librar
 set(CPACK_DEBIAN_LIBRARY_PACKAGE_CONTROL_EXTRA ${PROJECT_BINARY_DIR}/debian/symbols
                                                ${PROJECT_BINARY_DIR}/debian/triggers)
 
+set(CPACK_DEBIAN_ENCRYPTION_PACKAGE_NAME libzarvo-tls${PROJECT_VERSION_MAJOR})
+set(CPACK_DEBIAN_ENCRYPTION_PACKAGE_SECTION libs)
+set(CPACK_DEBIAN_ENCRYPTION_PACKAGE_RECOMMENDS ca-certificates)
+set(CPACK_DEBIAN_ENCRYPTION_DESCRIPTION "portable utility functions - encrypted transfers\n${purpose}
+.
+What its transfers over https, ftps and smtps need. The library loads it when a
+transfer first does.")
+set(CPACK_DEBIAN_ENCRYPTION_PACKAGE_CONTROL_EXTRA ${PROJECT_BINARY_DIR}/debian/triggers)
+
 set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_NAME libzarvo-dev)
 set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_SECTION libdevel)
 set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_DEPENDS
@@ -39,6 +52,7 @@ set(CPACK_DEBIAN_TOOL_PACKAGE_NAME zv)
 set(CPACK_DEBIAN_TOOL_PACKAGE_SECTION utils)
 set(CPACK_DEBIAN_TOOL_PACKAGE_DEPENDS
     "${CPACK_DEBIAN_LIBRARY_PACKAGE_NAME} (>= ${CPACK_DEBIAN_PACKAGE_VERSION})")
+set(CPACK_DEBIAN_TOOL_PACKAGE_RECOMMENDS ${CPACK_DEBIAN_ENCRYPTION_PACKAGE_NAME})
 set(CPACK_DEBIAN_TOOL_DESCRIPTION "files, paths and plugins at a shell's prompt\n${purpose}
 .
 This is its command-line tool.")
@@ -64,7 +78,7 @@ foreach(name changelog changelog.Debian)
   execute_process(COMMAND gzip -9nf debian/${name}
     WORKING_DIRECTORY ${PROJECT_BINARY_DIR} COMMAND_ERROR_IS_FATAL ANY)
 endforeach()
-foreach(component LIBRARY DEVELOPMENT TOOL)
+foreach(component LIBRARY ENCRYPTION DEVELOPMENT TOOL)
   set(folder ${CMAKE_INSTALL_DATADIR}/doc/${CPACK_DEBIAN_${component}_PACKAGE_NAME})
   string(TOLOWER ${component} component)
   install(FILES LICENSE DESTINATION ${folder} RENAME copyright COMPONENT ${component})

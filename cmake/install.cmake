@@ -35,7 +35,7 @@ if(NOT TARGET zarvo)
 endif()
 configure_file(cmake/zarvo.pc.in zarvo.pc @ONLY)
 install(FILES ${PROJECT_BINARY_DIR}/zarvo.pc DESTINATION ${pkgconfig_dir} COMPONENT development)
-install(FILES include/zarvo.h DESTINATION ${CMAKE_INSTALL_INCLUDEDIR} COMPONENT development)
+install(FILES include/zarvo.h include/zarvo.hpp DESTINATION ${CMAKE_INSTALL_INCLUDEDIR} COMPONENT development)
 
 if(TARGET zv)
   install(TARGETS zv RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT tool)

@@ -1,4 +1,4 @@
-# What CPack makes: three Debian packages on Linux, one zip for Windows. `scripts/package` calls it.
+# What CPack makes: four Debian packages on Linux, one zip for Windows. `scripts/package` calls it.
 set(CPACK_PACKAGE_NAME zarvo)
 set(CPACK_PACKAGE_VENDOR "the zarvo authors")
 set(CPACK_PACKAGE_CONTACT "the zarvo authors <authors@zarvo.test>")
@@ -12,7 +12,7 @@ if(WIN32)
   endif()
   set(CPACK_GENERATOR ZIP)
   set(CPACK_PACKAGE_FILE_NAME zarvo-${PROJECT_VERSION}-win64)
-  install(FILES README.md CHANGELOG.md LICENSE DESTINATION . COMPONENT library)
+  install(FILES README.md CHANGELOG.md LICENSE DESTINATION . COMPONENT documents)
   # The sample host with its plugins; make_samples is there where stb is.
   set(host gallery)
   if(TARGET make_samples)
@@ -22,10 +22,18 @@ if(WIN32)
   install(DIRECTORY ${PROJECT_BINARY_DIR}/examples/gallery_plugins/ DESTINATION plugins
     COMPONENT tool)
   set(examples .)
+  set(examples_component documents)
+  # The zip has a folder for each C runtime, made from a build of its own, each with everything.
+  set(CPACK_INSTALL_CMAKE_PROJECTS ${PROJECT_BINARY_DIR} zarvo documents /)
+  foreach(component library development tool)
+    list(APPEND CPACK_INSTALL_CMAKE_PROJECTS ${PROJECT_BINARY_DIR} zarvo ${component} /msvcrt
+                                             ${PROJECT_BINARY_DIR}-ucrt zarvo ${component} /ucrt)
+  endforeach()
 else()
   include(cmake/debian.cmake)
   set(examples ${CMAKE_INSTALL_DATADIR}/doc/${CPACK_DEBIAN_DEVELOPMENT_PACKAGE_NAME})
+  set(examples_component development)
 endif()
-install(DIRECTORY examples DESTINATION ${examples} COMPONENT development
+install(DIRECTORY examples DESTINATION ${examples} COMPONENT ${examples_component}
   PATTERN .clang-tidy EXCLUDE)
 include(CPack)

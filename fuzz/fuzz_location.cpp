@@ -14,7 +14,7 @@ extern "C" int __wrap_getaddrinfo(const char*, const char*, const addrinfo*, add
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   const std::string text(reinterpret_cast<const char*>(data), size);
-  zv::location_t location;
+  zv::Location location;
   const zv::LocationKind kind = zv::parse_location(text.c_str(), location);
   CHECK(kind == location.kind);
   if (kind == zv::LOC_NONE) return 0;

@@ -7,7 +7,6 @@
 #include <vector>
 
 #include "check.h"
-#include "transfer/pump.h"
 #include "transfer/reply.h"
 
 namespace {

@@ -48,7 +48,8 @@ extern "C" {
  *   that the function names. A path is worked on in a copy of #ZV_PATH_MAX bytes, so that at most
  *   319 characters of it take part.
  * - Results are lengths (`size_t`), counts (`int`, -1 for no memory or not found), truth values
- *   (`int`, 1 or 0) or pointers (NULL for not found or no memory). Nothing throws.
+ *   (`int`, 1 or 0) or pointers (NULL for not found or no memory). No function throws, and no
+ *   exception may pass through one: callbacks and plugins must not throw.
  * - A pointer argument must not be NULL unless the function says what NULL means.
  * - A heap block that a function hands out belongs to the caller and goes back through zv_free(),
  *   or through zv_strlist_free() for a string list.
@@ -164,7 +165,7 @@ ZV_API const char* zarvo_version(void);
  * @param release a buffer of at least 12 bytes that receives the name of the release, or NULL.
  * @return 1, or 0 for the empty text, which leaves every output as it was.
  * @par Thread safety
- *   Safe from any thread.
+ *   Safe from any thread, while no thread changes the locale.
  */
 ZV_API int zv_split_version(const char* version, int* major, int* minor, int* patch, char* release);
 
@@ -176,7 +177,7 @@ ZV_API int zv_split_version(const char* version, int* major, int* minor, int* pa
 
 /**
  * @defgroup copies Bounded copies and zero-separated sequences
- * The copy behind every sized output, and several texts in one buffer.
+ * The copy by whose rule every sized output is written, and several texts in one buffer.
  *
  * A zero-separated sequence is any number of non-empty texts laid end to end, each with its own
  * NUL, and one more NUL that closes the whole: `a\0xy\0\0`. Its length counts the texts and their
@@ -247,7 +248,7 @@ ZV_API void zv_strreplchr(char* s, int from, char to);
 ZV_API size_t zv_strnulllen(const char* seq);
 
 /**
- * Make a zero-separated sequence of a text, by writing one more NUL behind it.
+ * Make a zero-separated sequence of a text, by writing one more NUL after it.
  *
  * @param s the text, in a buffer of at least its length + 2 bytes. An empty text becomes the empty
  *          sequence.
@@ -257,7 +258,7 @@ ZV_API size_t zv_strnulllen(const char* seq);
 ZV_API void zv_strnull(char* s);
 
 /**
- * Make one text of a zero-separated sequence, with a separator behind each of its pieces.
+ * Make one text of a zero-separated sequence, with a separator after each of its pieces.
  *
  * The result is what zv_strlist() takes apart again with the same separator.
  *
@@ -406,7 +407,7 @@ ZV_API void zv_strshift(char* s, int n);
  * @param dst the text, in a buffer of at least its length - `n` + the length of `src` + 1 bytes.
  * @param src what to put there, all of it. Must not overlap `dst`.
  * @param n   how many characters it replaces, from 0 to the length of `dst`.
- * @return the place in `dst` right behind what was put there.
+ * @return the place in `dst` right after what was put there.
  * @par Thread safety
  *   Safe from any thread, for distinct texts.
  */
@@ -435,7 +436,7 @@ ZV_API char* zv_strnrepl(char* dst, const char* src, int n);
  *
  * @param a one text.
  * @param b the other.
- * @return below 0, 0 or above 0, as `a` sorts before, with or behind `b`.
+ * @return below 0, 0 or above 0, as `a` sorts before, with or after `b`.
  * @par Thread safety
  *   Safe from any thread, while no thread changes the locale.
  */
@@ -522,11 +523,11 @@ ZV_API int zv_strreplstr(char* s, const char* needle, const char* repl);
 ZV_API int zv_strireplstr(char* s, const char* needle, const char* repl);
 
 /**
- * Put a character in front of a text and another behind it.
+ * Put a character in front of a text and another after it.
  *
  * @param s     the text, in a buffer of at least its length + 3 bytes.
  * @param open  the character to go in front, a bracket or a quote or any other.
- * @param close the character to go behind.
+ * @param close the character to go after it.
  * @return 2, the number of characters added.
  * @par Thread safety
  *   Safe from any thread, for distinct texts.
@@ -552,7 +553,7 @@ ZV_API int zv_strubrkt(char* s, int open, int close);
  *
  * The case of each is told by its first two letters: two upper-case ones mean all upper case, two
  * lower-case ones all lower case, an upper-case one before a lower-case one a capital first and
- * lower case behind it. Anything else leaves that part as it is. A model without an extension
+ * lower case after it. Anything else leaves that part as it is. A model without an extension
  * rules the whole file name, and folders never change. The extension is the one that zv_dot()
  * finds.
  *
@@ -642,14 +643,17 @@ ZV_API int zv_strpat(const char* text, const char* pattern);
  * @defgroup strlist String lists
  * The one container that the whole interface hands around.
  *
- * A string list is a heap array of heap texts with a NULL entry behind the last: walk it, index it,
+ * A string list is a heap array of heap texts with a NULL entry after the last: walk it, index it,
  * sort it with qsort() as it lies. Whoever holds the list owns the array and the texts, and gives
  * both back with zv_strlist_free(). The empty list is an array with only the NULL in it, not a NULL
  * pointer. Nobody can count on room to spare in the array: where it may move, functions take its
  * address.
  *
  * Most functions take a count `n` of the entries, which saves counting them again; a negative `n`
- * counts them up to the NULL. A count above the real one is not noticed. Positions begin at 0.
+ * counts them up to the NULL. A count above the real one is not noticed. With one below it, the
+ * list ends after `n` entries: those after them are never read, moved or freed, and belong to the
+ * caller. They stay where they stand in the array, until zv_strlist_insert() or zv_strlist_cat()
+ * writes over them, or zv_strlist_reduce() makes the array shorter. Positions begin at 0.
  *
  * @code
  * char** names;
@@ -672,7 +676,8 @@ ZV_API int zv_strpat(const char* text, const char* pattern);
  * @param out  receives the list, or NULL when memory ran out. What it held before is not freed.
  * @param text the text, or NULL for the empty list.
  * @param sep  the separator; 0 when `text` is a zero-separated sequence, each of whose texts
- *             becomes an entry.
+ *             becomes an entry. Only its low 8 bits count, so that 0xE9 and -23 are the same byte,
+ *             and 256 is 0.
  * @return the number of entries; -1 when memory ran out.
  * @par Thread safety
  *   Safe from any thread.
@@ -693,7 +698,8 @@ ZV_API int zv_strlist_len(char** list);
  * Give a list and its texts back.
  *
  * @param list the list, or NULL, which does nothing.
- * @param n    how many entries to free before the array, negative for all.
+ * @param n    how many entries to free before the array, negative for all. The texts of any more
+ *             are not freed.
  * @return 0, always.
  * @par Thread safety
  *   Safe while no other thread uses the list.
@@ -721,7 +727,7 @@ ZV_API int zv_strlist_insert(char*** list, int n, int pos, const char* s);
  * @param n    the number of entries, negative to count them.
  * @param pos  the entry's position, at most the number of entries.
  * @return the entry's text, which now belongs to the caller and goes back through zv_free(); NULL
- *         when `pos` is that of the closing NULL.
+ *         when `pos` is the number of entries, and then nothing changes.
  * @par Thread safety
  *   Safe while no other thread uses the list.
  */
@@ -776,16 +782,20 @@ ZV_API int zv_strlist_idx(char** list, int n, const char* s);
  * @param s    the text to find.
  * @return the position of the first entry that equals it; -1 when there is none.
  * @par Thread safety
- *   Safe while no thread changes the list.
+ *   Safe while no thread changes the list or the locale.
  */
 ZV_API int zv_strlist_iidx(char** list, int n, const char* s);
 
 /**
- * Compare two entries, for qsort() over a list's array.
+ * Compare two entries, to sort a list.
+ *
+ * qsort() takes a function of two `const void*`: write one that returns
+ * `zv_strlist_cmp((const char**)a, (const char**)b)`, which is C and C++. For std::sort() it is
+ * `[](const char* a, const char* b) { return zv_strlist_cmp(&a, &b) < 0; }`.
  *
  * @param a points at one entry.
  * @param b points at the other.
- * @return -1, 0 or 1, as the bytes of the one, read as unsigned values, sort before, with or behind
+ * @return -1, 0 or 1, as the bytes of the one, read as unsigned values, sort before, with or after
  *         those of the other.
  * @par Thread safety
  *   Safe while no thread changes the texts.
@@ -793,13 +803,13 @@ ZV_API int zv_strlist_iidx(char** list, int n, const char* s);
 ZV_API int zv_strlist_cmp(const char** a, const char** b);
 
 /**
- * Compare two entries without regard to case, for qsort() over a list's array.
+ * Compare two entries without regard to case, to sort a list as with zv_strlist_cmp().
  *
  * @param a points at one entry.
  * @param b points at the other.
  * @return below 0, 0 or above 0, as zv_stricmp() compares.
  * @par Thread safety
- *   Safe while no thread changes the texts.
+ *   Safe while no thread changes the texts or the locale.
  */
 ZV_API int zv_strlist_icmp(const char** a, const char** b);
 
@@ -826,7 +836,7 @@ ZV_API int zv_strlist_set(char** list, int n);
  * @param n    the number of entries, negative to count them.
  * @return how many entries were removed. Cannot fail; without memory for an index it takes longer.
  * @par Thread safety
- *   Safe while no other thread uses the list.
+ *   Safe while no other thread uses the list and none changes the locale.
  */
 ZV_API int zv_strlist_iset(char** list, int n);
 
@@ -857,6 +867,9 @@ ZV_API int zv_strlist_reduce(char*** list, int n, int pos);
  * apart from a root it ends with no separator. zv_normalize_path() makes one of what a user wrote;
  * the other functions expect one and take a backslash for an ordinary character. Only
  * zv_normalize_path(), the path map and the search path look beyond the text.
+ *
+ * At most 319 characters of a path take part. The calls of Windows itself end at 259, unless the
+ * application's manifest asks for long paths.
  *
  * @code
  * char path[ZV_PATH_MAX] = "notes\\drafts\\..\\todo.txt";
@@ -910,7 +923,7 @@ ZV_API int zv_ispath_UNIX(const char* path);
 ZV_API int zv_ispath_relative(const char* path);
 
 /**
- * Tell whether a path is a root: `X:/`, `/`, or `//server/share` with or without one `/` behind it.
+ * Tell whether a path is a root: `X:/`, `/`, or `//server/share` with or without one `/` after it.
  *
  * @param path the path.
  * @return 1 if it is, else 0: `X:` alone is none.
@@ -966,7 +979,7 @@ ZV_API int zv_add_slash(char* path);
 ZV_API int zv_trim_slash(char* path);
 
 /**
- * Split a path in place into its pieces, each ended by a NUL, with an empty piece behind the last.
+ * Split a path in place into its pieces, each ended by a NUL, with an empty piece after the last.
  *
  * The first piece of an absolute path is its root with its separator: `X:/a/b` becomes `X:/`, `a`
  * and `b`. `X:` and `X:name` have no root and split as a relative path does. An empty piece ends
@@ -1024,14 +1037,15 @@ ZV_API int zv_extract_extension(const char* path, char* out, size_t size);
  * Bring a path as somebody wrote it into canonical form, in place.
  *
  * In this order: white space at both ends goes and each backslash becomes `/`; doubled separators
- * and "." components behind a separator go, but not a "." that the path begins with; `X:` and
+ * and "." components after a separator go, but not a "." that the path begins with; `X:` and
  * `X:name` are completed with the current folder of that drive, and `/name` with the current drive;
  * each ".." cancels the component before it; a first component `~` becomes the home folder; each
  * component `%NAME%` or `$NAME` becomes the value of that variable of the process environment, with
  * its backslashes turned and the separator at its end removed.
  *
- * A value is not normalised again, and since ".." has worked before, `%TEMP%/../x` is `x`. `~name`
- * is an ordinary component. On Linux, where there are no drives, `/name` stays as it is and `X:`
+ * A value is not normalised again, and since ".." has worked before, `%TEMP%/../x` is `x`. At most
+ * 319 characters of a value count: a longer one is cut without a word. `~name` is an ordinary
+ * component. On Linux, where there are no drives, `/name` stays as it is and `X:`
  * and `X:name` fail; `X:/name` is text there and stays.
  *
  * @param path the path, in a buffer of #ZV_PATH_MAX bytes.
@@ -1040,8 +1054,8 @@ ZV_API int zv_extract_extension(const char* path, char* out, size_t size);
  *         or the result has more than 319 characters. 0 also for a variable that is not set: then
  *         the components before it stand in `path`.
  * @par Thread safety
- *   Safe from any thread, for distinct buffers, while none changes the process environment or a
- *   current folder.
+ *   Safe from any thread, for distinct buffers, while none changes the process environment, a
+ *   current folder or the locale.
  */
 ZV_API int zv_normalize_path(char* path);
 
@@ -1049,7 +1063,7 @@ ZV_API int zv_normalize_path(char* path);
  * Make a relative path absolute.
  *
  * Only the text is looked at: "." and ".." in front of the path are worked off against the base,
- * and those behind its first other component stay where they are. The path is not tested for being
+ * and those after its first other component stay where they are. The path is not tested for being
  * relative, and an absolute one would be appended like any component: ask zv_ispath_relative()
  * first.
  *
@@ -1061,7 +1075,8 @@ ZV_API int zv_normalize_path(char* path);
  *         empty, or `out` is untouched because the base is empty, the working directory cannot be
  *         had or the result has more than 319 characters.
  * @par Thread safety
- *   Safe from any thread, for distinct buffers.
+ *   Safe from any thread, for distinct buffers; without a base while none changes the working
+ *   directory.
  */
 ZV_API int zv_absolute(const char* path, const char* base, char* out, size_t size);
 
@@ -1080,7 +1095,8 @@ ZV_API int zv_absolute(const char* path, const char* base, char* out, size_t siz
  *         copy of the path: the two share no root, one of them is empty, the working directory
  *         cannot be had or the result has more than 319 characters.
  * @par Thread safety
- *   Safe from any thread, for distinct buffers.
+ *   Safe from any thread, for distinct buffers, while none changes the locale; without a base while
+ *   none changes the working directory either.
  */
 ZV_API int zv_relative(const char* path, const char* base, char* out, size_t size);
 
@@ -1097,7 +1113,8 @@ ZV_API int zv_relative(const char* path, const char* base, char* out, size_t siz
  * @return 1 if something was recorded; 0 if the folders are the same or the record was there
  *         already, and on failure: memory ran out or the working directory cannot be had.
  * @par Thread safety
- *   Safe from any thread: holds the path map's own lock.
+ *   Safe from any thread: holds the path map's own lock. Without a folder in `to`, while none
+ *   changes the working directory.
  */
 ZV_API int zv_pathmap(const char* from, const char* to);
 
@@ -1122,8 +1139,8 @@ ZV_API void zv_pathmap_clear(void);
  * @return 1 if the path exists, or now names the first candidate that does; 0 if none exists,
  *         `path` being unchanged.
  * @par Thread safety
- *   Safe from any thread, for distinct buffers: holds the path map's own lock while the candidates
- *   are looked for on disk.
+ *   Safe from any thread, for distinct buffers, while none changes the locale: holds the path map's
+ *   own lock while the candidates are looked for on disk.
  */
 ZV_API int zv_pathmap_locate(char* path);
 
@@ -1145,9 +1162,9 @@ ZV_API int zv_pathlist(char*** list);
 /**
  * Find a file by its name in the folders of the search path, in their order.
  *
- * Only the last component of the path counts; without one, as in a root, the first folder itself is
- * found. The working directory is not searched, no extension is added, and a folder of that name
- * counts as found. A candidate of more than 319 characters is passed over.
+ * Only the last component of the path counts; without one, as in a root, the first folder that
+ * exists is itself found. The working directory is not searched, no extension is added, and a
+ * folder of that name counts as found. A candidate of more than 319 characters is passed over.
  *
  * @param path the name, in a buffer of #ZV_PATH_MAX bytes.
  * @return 1 if `path` now names the first that exists; 0 if none does, `path` being unchanged.
@@ -1170,11 +1187,17 @@ ZV_API int zv_path_locate(char* path);
  * it, which is not at all while another thread changes it: for settings that threads share there is
  * the private environment.
  *
+ * After fork() in a process with threads, the child may call what POSIX calls async-signal-safe,
+ * and nothing here: a lock that another thread held at that moment, as that of the private
+ * environment, of the path map or of the C library's heap, is never given back in the child.
+ *
  * @code
  * char folder[ZV_PATH_MAX];
  * if (zv_tempdir(folder, sizeof folder) == 0) return 1;
  * zv_putenv_private("PLG", "/opt/app/plugins", 0);
- * puts(zv_getenv_private("PLG"));        // prints /opt/app/plugins
+ * char* plugins = zv_getenv_private("PLG");
+ * if (plugins != NULL) puts(plugins);    // prints /opt/app/plugins
+ * zv_free(plugins);
  * @endcode
  * @{
  */
@@ -1196,13 +1219,15 @@ ZV_API size_t zv_homedir(char* buf, size_t size);
 /**
  * Tell the folder for temporary files: the variable `TMP`, else `TEMP`, and on Linux else `TMPDIR`.
  *
- * The first of them that is set decides, even where it names no usable folder; on Linux an empty
- * one counts as not set. On Windows the long form of the folder is given.
+ * The first of them that is set decides, even where it names no usable folder; an empty one, which
+ * a process can inherit on Windows too, counts as not set. On Windows the long form of the folder
+ * is given.
  *
  * @param buf  receives the folder, cut to `size` - 1 characters.
  * @param size bytes in `buf`.
- * @return the folder's length; 0 on failure: no variable is set and `buf` is untouched, or what
- *         stands in `buf` is no folder that may be read and written.
+ * @return the folder's length; 0 on failure: no variable is set, or that one has 320 characters or
+ *         more, and `buf` is untouched, or what stands in `buf` is no folder that may be read and
+ *         written.
  * @par Thread safety
  *   Safe from any thread while none changes the process environment.
  */
@@ -1245,17 +1270,18 @@ ZV_API size_t zv_hostname(char* buf, size_t size);
  * Set, append to or remove a variable of the private environment, or clear it.
  *
  * Names are looked up as a whole and without regard to case, as the locale has it when the first
- * variable is made. The process environment is neither read nor changed. The library itself reads
- * the variables that name plugin folders.
+ * variable is made: a later change of the locale changes nothing until all variables are removed.
+ * The process environment is neither read nor changed. The library itself reads the variables that
+ * name plugin folders (see @ref plugin).
  *
  * @param name   the variable, or NULL to remove all of them.
  * @param value  the value, or NULL to remove the variable, which need not exist.
- * @param append 0 to give the variable this value alone; otherwise the value is added behind those
+ * @param append 0 to give the variable this value alone; otherwise the value is added after those
  *               that it has, unless it is one of them.
  * @return 1; 0 when memory ran out, or when the name or the value holds the byte 0x1E. Then nothing
  *         has changed, except that a variable to be set anew is gone when memory ran out.
  * @par Thread safety
- *   Safe from any thread: holds the private environment's own lock.
+ *   Safe from any thread, while none changes the locale: holds the private environment's own lock.
  */
 ZV_API int zv_putenv_private(const char* name, const char* value, int append);
 
@@ -1263,7 +1289,7 @@ ZV_API int zv_putenv_private(const char* name, const char* value, int append);
  * Read a variable of the private environment.
  *
  * @param name the variable, in any case.
- * @return its values, each ended by a NUL, with one more NUL behind the last, so that read as one
+ * @return its values, each ended by a NUL, with one more NUL after the last, so that read as one
  *         text it is the first value: a block to be given back with zv_free(). NULL when there is
  *         no such variable or memory ran out.
  * @par Thread safety
@@ -1573,8 +1599,9 @@ ZV_API int zv_fputs(const char* s, FILE* fp, int crlf);
  * What a folder holds: one name after another, or a list of all that a filter lets through, with or
  * without the folders below it.
  *
- * Names come in the platform's order, which is no order. A path with its NUL takes at most
- * #ZV_PATH_MAX bytes: nothing longer is ever handed out, and a scan that meets one fails.
+ * A folder's path is written with `/`; on Linux a `\` is part of a name, as it is in the names that
+ * are handed out. Names come in the platform's order, which is no order. A path with its NUL takes
+ * at most #ZV_PATH_MAX bytes: nothing longer is ever handed out, and a scan that meets one fails.
  *
  * @code
  * const dirsel_t images = {NULL, "*.png;*.jpg", ";", 0, 0};
@@ -1589,6 +1616,9 @@ ZV_API int zv_fputs(const char* s, FILE* fp, int crlf);
 
 /**
  * Decides whether an entry goes into the list of a scan.
+ *
+ * A filter must return: neither an exception nor longjmp() may leave it, for the library undoes
+ * nothing on their way.
  *
  * @param dir  the folder being scanned: the text that zv_dir_scan() was given or, below it, a
  *             folder's full path without a separator at its end.
@@ -1648,9 +1678,11 @@ ZV_API intptr_t zv_dir_close(intptr_t handle);
 /**
  * List what a folder holds, itself and its parent left out, each folder in front of its content.
  *
- * A folder that is missing or cannot be read holds nothing, and one whose reading fails on the way
- * what was read of it; that is no failure. A symbolic link is an entry and is never followed,
- * except where `dir` itself is one.
+ * A folder that is missing or cannot be opened, for want of a right or of descriptors, of which
+ * each level takes one, holds nothing, and one whose reading fails on the way what was read of it;
+ * that is no failure. Of a folder that may be read but not searched the names are listed, and
+ * nothing below it. A symbolic link is an entry and is never followed, except where `dir` itself is
+ * one.
  *
  * @param dir       the folder; empty means the current one.
  * @param list      receives the list, to be given back with zv_strlist_free(); NULL on failure.
@@ -1692,8 +1724,10 @@ ZV_API int zv_dir_select(const char* dir, const char* name, const dirsel_t* sel)
  * @defgroup status File status
  * One path on the file system: what it is, who may use it, whether it is hidden.
  *
- * Paths are written with `/` or `\`, whichever comes to hand, on every platform. Nothing is
- * printed; a failure leaves `errno` (or the platform's last error) as the failing call set it.
+ * Paths are written with `/` or `\`, whichever comes to hand, on every platform. On Linux, where a
+ * `\` may be part of a name, a path that exists as it is written is taken so, and `\` is read as
+ * `/` only in any other: a name that a scan handed out means itself. Nothing is printed; a failure
+ * leaves `errno` (or the platform's last error) as the failing call set it.
  *
  * @code
  * struct _stat64 st;
@@ -1770,8 +1804,9 @@ ZV_API int zv_set_hidden(const char* path, int hidden);
  * @defgroup tree Trees
  * Whole chains of directories made, whole trees removed.
  *
- * Paths are in either separator style and have at most 319 characters: a longer one is refused,
- * since a cut one would name something else. What was done before a failure stays done.
+ * Paths are in either separator style, as for zv_stat(), and have at most 319 characters: a longer
+ * one is refused, since a cut one would name something else. What was done before a failure stays
+ * done.
  *
  * @code
  * if (zv_mkfile("out/report/summary.txt")) puts("out/report is there, and an empty file in it");
@@ -1788,8 +1823,8 @@ ZV_API int zv_set_hidden(const char* path, int hidden);
  * ends it, as for zv_split_path().
  *
  * @param path the path; the empty one asks for nothing.
- * @return 1 when all of it exists afterwards, 0 otherwise and for a path of more than 319
- *         characters.
+ * @return 1 when all of it exists afterwards; 0 otherwise, `errno` telling what failed:
+ *         ENAMETOOLONG for a path of more than 319 characters.
  * @par Thread safety
  *   Safe from any thread, also for paths with common parts.
  */
@@ -1800,8 +1835,7 @@ ZV_API int zv_mkpath(const char* path);
  * already is emptied.
  *
  * @param path the file.
- * @return 1 when the file is there and empty, 0 otherwise and for a path of more than 319
- *         characters.
+ * @return 1 when the file is there and empty; 0 otherwise, with `errno` as zv_mkpath() sets it.
  * @par Thread safety
  *   Safe from any thread.
  */
@@ -1816,8 +1850,11 @@ ZV_API int zv_mkfile(const char* path);
  * There is no roll-back. Hidden entries are removed like others; a read-only file stops it where
  * the platform protects such files.
  *
+ * A root, a drive (`X:`, `X:/`, `//./X:`) and a path whose last component is `.` or `..` are
+ * refused.
+ *
  * Links are never followed: a link in the tree is removed itself, and a link in place of the
- * directory, with or without a separator behind it, gives 0. On Linux a directory that is swapped
+ * directory, with or without a separator after it, gives 0. On Linux a directory that is swapped
  * for a link meanwhile does not lead the removal outside the tree either.
  *
  * @param path the directory.
@@ -1859,7 +1896,8 @@ ZV_API int zv_rmpath(const char* path);
  * A path without a directory is looked for where the platform looks; on Windows, a library with an
  * absolute path finds the libraries that lie beside it. Each open needs its own zv_dll_close(). On
  * Linux the library's symbols are all bound at once and stay its own (`RTLD_NOW | RTLD_LOCAL`), and
- * a path that leads to a pipe, or to a library whose end is missing, is refused rather than tried.
+ * a path that leads to a pipe, or to a library whose end is missing or still zeros, is refused
+ * rather than tried.
  *
  * @param path    the library's path; with its extension it has at most 319 characters.
  * @param has_ext 0 to add ".dll", also to a path that ends with it already; otherwise the path is
@@ -1911,7 +1949,10 @@ ZV_API void* zv_dll_close(void* lib);
  * record (#zv_plugin_t), which keeps the plugin's formats also while its library is unloaded.
  *
  * A plugin is code and runs with the host's rights: name a folder that only trusted users can write
- * to.
+ * to. Name it by an absolute path, as one value, and only when there is one: an empty value means
+ * the working folder, a relative one is found from there, and of several values only the first
+ * counts. `~`, `%NAME%` and `$NAME` in it are replaced from the process environment, as
+ * zv_normalize_path() does it, so a host that is started by others leaves them out.
  *
  * @code
  * typedef struct img_api_t { int (*width)(const char* path); } img_api_t;  // both sides know it
@@ -1987,7 +2028,8 @@ typedef struct plugin_t plugin_t;
 /**
  * A plugin's descriptor, which lies in the plugin's memory and lives while its library is loaded.
  *
- * None of the three fields may be NULL. Fields of the API's own may follow them.
+ * None of the three fields may be NULL. Fields of the API's own may follow them. Neither function
+ * may throw or otherwise leave through the library: the plugin would stay loaded for good.
  */
 struct plugin_t {
   /** Called once before the library is let go, with the descriptor; returns NULL. */
@@ -2017,6 +2059,9 @@ typedef struct zv_plugin_t {
 /**
  * The entry that a plugin's library exports under the name `zv_plugin`.
  *
+ * It must not throw: nothing is released when a call leaves through the library. It may call its
+ * host, which may use its arrays and records meanwhile, but for the record that is being loaded.
+ *
  * @param api  the API that the host asks for.
  * @param min  the oldest version that the host speaks.
  * @param max  the newest version that the host speaks, not below `min`.
@@ -2043,7 +2088,8 @@ typedef plugin_t* (*zv_plugin_entry_t)(const char* api, int min, int max, int* c
  * @return the record, loaded once, to be given back with zv_plugin_destroy(); NULL when the plugin
  *         was not accepted or memory ran out.
  * @par Thread safety
- *   Safe from any thread, as far as the plugin's entry is.
+ *   Safe from any thread, as far as the plugin's entry is, while none changes the process
+ *   environment, the locale or, for a relative `dir`, the working directory.
  */
 ZV_API zv_plugin_t* zv_plugin_create(const char* dir, const char* lib, const char* api, int min,
                                      int max, int* code);
@@ -2094,7 +2140,8 @@ ZV_API int zv_plugin_unload(zv_plugin_t* rec);
  * array already counts as added, and nothing is loaded.
  *
  * @param plugins the array: a heap block of records that ends with NULL, or NULL for none yet.
- *                Receives its new address. A failure leaves it as it was.
+ *                Receives its new address, once the plugin has run: what the plugin had its host
+ *                add meanwhile stays. A failure leaves it as it was.
  * @param path    the library's path: normalised, and made absolute from the working directory.
  * @param api     the name of the API.
  * @param min     the oldest version that the host speaks, 0 or more.
@@ -2105,7 +2152,8 @@ ZV_API int zv_plugin_unload(zv_plugin_t* rec);
  * @return 1 when the library is in the array, 0 when it is not. Destroy each record, then give the
  *         array back with zv_free().
  * @par Thread safety
- *   Safe from any thread, for distinct arrays.
+ *   Safe from any thread, for distinct arrays and as far as the plugin's entry is, while none
+ *   changes the process environment, the locale or, for a relative `path`, the working directory.
  */
 ZV_API int zv_plugin_add_lib(zv_plugin_t*** plugins, const char* path, const char* api, int min,
                              int max, int* code, int keep);
@@ -2147,22 +2195,24 @@ ZV_API int zv_plugin_match_vers(int min, int max, int oldest, int newest, int* v
  *
  * @param plugins receives a new array of the accepted records, which ends with NULL; one that it
  *                held is neither used nor freed. Left as it was when there is no folder or no file
- *                to try, or no memory to list them; NULL when memory for the array ran out.
+ *                to try, or no memory to list them; NULL while the plugins run, and when memory for
+ *                the array ran out.
  * @param api     the name of the API. Its base name has 1 to 47 characters.
  * @param min     the oldest version that the host speaks, 0 or more.
  * @param max     the newest version that the host speaks, not below `min`.
  * @param keep    0 to unload each plugin at once.
  * @return how many were accepted. Destroy each record, then give the array back with zv_free().
  * @par Thread safety
- *   Safe from any thread, as far as the plugins' entries are. Reports that are made at the same
- *   time mix.
+ *   Safe from any thread, as far as the plugins' entries are, while none changes the process
+ *   environment, the locale or, for a relative folder, the working directory. Holds the private
+ *   environment's own lock, but not while plugins run. Reports that are made at the same time mix.
  */
 ZV_API int zv_plugin_enumerate(zv_plugin_t*** plugins, const char* api, int min, int max, int keep);
 
 /**
  * Find the record of a library.
  *
- * @param plugins an array of records that ends with NULL.
+ * @param plugins an array of records that ends with NULL, or NULL.
  * @param lib     the library's file name, compared with its case; NULL and "" are never found.
  * @return the first record of that name, which stays the array's; NULL when there is none.
  * @par Thread safety
@@ -2222,7 +2272,7 @@ ZV_API int zv_plugin_formats(zv_plugin_t** plugins, char*** list);
 /**
  * Find the plugin that handles a file.
  *
- * @param plugins an array of records that ends with NULL.
+ * @param plugins an array of records that ends with NULL, or NULL.
  * @param path    the file's path, with `/`; NULL and "" are never matched. The file need not exist.
  * @return the first record with a pattern that matches the file's name, which stays the array's;
  *         NULL when there is none.
@@ -2235,7 +2285,7 @@ ZV_API zv_plugin_t* zv_plugin_get_entry_by_fmt(zv_plugin_t** plugins, const char
  * Tell whether a plugin handles a file.
  *
  * @param rec  the record.
- * @param path the file's path, with `/`. The file need not exist.
+ * @param path the file's path, with `/`; NULL and "" are never matched. The file need not exist.
  * @return 1 when one of the record's patterns matches the file's name, else 0.
  * @par Thread safety
  *   Safe from any thread while none changes the record.
@@ -2250,7 +2300,8 @@ ZV_API int zv_plugin_match_fmt(zv_plugin_t* rec, const char* path);
  * runs into the next entry's first.
  *
  * @param list        the string list of entries. NULL, or one without entries, gives 0.
- * @param count       how many entries to cover, from the first; negative for all.
+ * @param count       how many entries to cover, from the first; negative, or more than there are,
+ *                    for all.
  * @param description the new entry's description; NULL or "" for "All recognized formats".
  * @return 1 when the entry was appended; 0, with the list as it was, when one of the entries has no
  *         `|` or memory ran out.
@@ -2278,7 +2329,7 @@ ZV_API size_t zv_fmt_default(const char* entry, const char** pattern);
  * appended as it is written, so it should be an extension such as `.png`.
  *
  * @param entry the format entry.
- * @param name  the file name, in a buffer with room for the default pattern behind it.
+ * @param name  the file name, in a buffer with room for the default pattern after it.
  * @return where in `entry` the name's extension stands; `name`, when the default pattern was
  *         appended; NULL when the entry has no default pattern.
  * @par Thread safety
@@ -2309,7 +2360,7 @@ ZV_API char* zv_fmt_force(const char* entry, char* name);
  *
  * The last `@` before the first `/` ends the credentials, so a user may hold one (`u@d:pw@host`).
  * Without a port the credentials divide at their last `:`, with one at their first. In the path
- * behind a scheme, `%` and two hexadecimal digits stand for a byte; user, password and plain paths
+ * after a scheme, `%` and two hexadecimal digits stand for a byte; user, password and plain paths
  * are taken as written. `?` and `#` are characters like others. A host is a name with an IPv4
  * address, or four decimal numbers.
  *
@@ -2351,7 +2402,7 @@ ZV_API char* zv_fmt_force(const char* entry, char* name);
  * - No text adds a command or a header line: CR or LF in the user, password or decoded path of a
  *   network location makes it unusable, and a file with one in its name is not mailed.
  *
- * @param from the source: at most 318 characters behind the scheme; not `smtp://`. NULL or "" is a
+ * @param from the source: at most 318 characters after the scheme; not `smtp://`. NULL or "" is a
  *             failure of its side.
  * @param to   the destination, likewise.
  * @return 0 when all of the file has arrived and, in a local file, been written and closed.
@@ -2363,6 +2414,315 @@ ZV_API char* zv_fmt_force(const char* entry, char* name);
  *   Safe from any thread.
  */
 ZV_API int zv_copy(const char* from, const char* to);
+
+/** @} */
+
+/* ================================================================================================
+ * Transfers with a handle
+ */
+
+/**
+ * @defgroup handle Transfers with a handle
+ * A copy between locations that can be limited, watched, stopped and explained.
+ *
+ * A handle carries what holds for its runs: limits, logins, a function that watches. A run copies
+ * one file as zv_copy() does, in the calling thread, and tells afterwards why it failed: by a cause
+ * for the program and a reason for a person. There is no thread to start and nothing to end.
+ *
+ * @code
+ * zv_transfer_t* transfer = zv_transfer_create();
+ * char reason[200];
+ * if (transfer == NULL) return 1;
+ * zv_transfer_set(transfer, ZV_TRANSFER_SILENCE, 10000);         // a peer may be silent for 10 s
+ * zv_transfer_set(transfer, ZV_TRANSFER_SIZE, 1000000);
+ * if (zv_transfer_run(transfer, "missing.txt", "copy.txt") != 0) {
+ *   zv_transfer_reason(transfer, reason, sizeof reason);
+ *   puts(reason);                        // prints read missing.txt: No such file or directory
+ * }
+ * zv_transfer_destroy(transfer);
+ * @endcode
+ *
+ * The locations are those of zv_copy(), with these differences:
+ *
+ * - A text that begins with a scheme (a letter, then letters, digits, `+`, `-` or `.`) and `://`
+ *   is refused when that scheme is none of the four, and none of `https://` (port 443), `ftps://`
+ *   (990, encrypted from the first byte) and `smtps://` (465). A single letter is a drive.
+ * - A text may have 8,192 characters, a local path 319. User and password may hold escapes as the
+ *   path may. `%00` is refused, and so is a line end in a network location. The path of an HTTP
+ *   location is sent as it is written, without its fragment (`#`), and what a request cannot hold
+ *   is escaped.
+ * - An IPv6 address stands in brackets (`ftp://[::1]/f`); four numbers of 0 to 255 are an IPv4
+ *   address, and anything else is a name, which is looked up for both. Every address is tried, in
+ *   the system's order. A port is digits, from 1 to 65535; none after the colon is the default.
+ *
+ * And so do the protocols:
+ *
+ * - FTP (RFC 959): the size is asked for (RFC 3659), and a file may be empty. The data connection
+ *   goes to the machine of the control connection, whatever address a reply names; over IPv6 it is
+ *   asked for by `EPSV` (RFC 2428). An upload that fails resets it, so that the server does not
+ *   take the part for a whole file.
+ * - HTTP is 1.1 (RFC 9112). A GET takes 200 and 203 and follows five redirects, to `http://` and
+ *   `https://`, but never from `https://` to `http://`; the login goes along to the same scheme,
+ *   host and port only. A PUT takes any 2xx. A body without a length and without chunks ends with
+ *   the connection: that it was cut cannot be noticed then, except where the connection is
+ *   encrypted.
+ *
+ * An encrypted connection speaks TLS 1.2 or later, by the system's own means on Windows and by
+ * OpenSSL 3 on Linux: there a run loads `libzarvo_tls.so.1` (package `libzarvo-tls1`) when a
+ * location first needs it, and fails before it connects where that is not installed.
+ *
+ * - The server's certificate must come from an authority that the system trusts (on Linux
+ *   `SSL_CERT_FILE` and `SSL_CERT_DIR` say where those are), or that zv_transfer_trust() names; it
+ *   must be valid now; and the location's name must stand in its list of names, its address as an
+ *   address. A common name does not count, a wildcard holds for one label. Nothing turns this off.
+ *   Whether the certificate was revoked is not asked.
+ * - No login leaves before that, and nothing is tried again in the clear. The data connection of
+ *   `ftps://` is encrypted too (RFC 4217). A second handshake is refused.
+ * - On Windows the system may fetch certificates that it lacks, which takes its own time.
+ *
+ * A local destination takes its place whole: it is written beside that under a private name
+ * (`.zv-`, 16 hexadecimal digits, `.part`), closed, and renamed. A failure leaves the old file as
+ * it was and nothing else; only a kill leaves the private file, which no run touches again.
+ *
+ * - A link stays a link, and the file that it leads to is replaced; one that leads nowhere is
+ *   refused. What is no regular file, or is reached through `/proc` or `/dev/fd`, is written as it
+ *   is.
+ * - The file keeps the permission bits, the owner, the group and the access list of the one that it
+ *   replaces; on Windows access list and streams are the new file's. A new file has the bits of a
+ *   local source, else 0666, less the umask. Nothing is set-user, set-group or sticky.
+ * - Refused before any connection (#ZV_CAUSE_LANDING, and the reason names #ZV_TRANSFER_IN_PLACE)
+ *   is a destination that the process may not write, that has other hard links, whose owner or
+ *   access list cannot be kept, or whose folder does not let it be replaced.
+ * - A file that replaces one with content is flushed to the disk before it is renamed.
+ *
+ * A wait on a connection notices a cancel, the watch and every limit within 250 ms, and a local
+ * copy does so every 8 MiB. Looking up a name, opening a pipe and writing to a disk take what the
+ * system takes. What comes after the file has its place, or after the server's last good reply,
+ * changes nothing.
+ * @{
+ */
+
+/** What is limited, watched, stopped and explained; made by zv_transfer_create(). */
+typedef struct zv_transfer_t zv_transfer_t;
+
+/** What zv_transfer_set() sets. A number is never used again for something else. */
+enum zv_transfer_option {
+  /** Milliseconds a peer may be silent: a reply has to be complete by then, a body has to move.
+   *  30,000; in a mail 300,000, and 600,000 for the reply to the message; 0 for ever, and the speed
+   *  is not looked at. A value that was set holds for every reply. */
+  ZV_TRANSFER_SILENCE = 1,
+  ZV_TRANSFER_TIME = 2,  /**< milliseconds for the whole run; 0, as at first, for ever */
+  ZV_TRANSFER_SPEED = 3, /**< fewest bytes a second of a body, as the mean over one silence; 1 */
+  /** Most bytes that a download or a local copy may have, the first leg between two servers too; at
+   *  first no limit. */
+  ZV_TRANSFER_SIZE = 4,
+  ZV_TRANSFER_IN_PLACE = 5, /**< 1 writes over a local file as zv_copy() does; 0 */
+  /** 1 fails where a local destination exists, be it a link that leads nowhere; an upload does not
+   *  look, and the file between two servers is none. 0 */
+  ZV_TRANSFER_KEEP = 6,
+  ZV_TRANSFER_SYNC = 7 /**< 1 flushes a new file to the disk too, on Linux with its folder; 0 */
+};
+
+/** Why a run failed, for a program to act on. */
+enum zv_transfer_cause {
+  ZV_CAUSE_NONE = 0,         /**< it did not fail */
+  ZV_CAUSE_LOCATION = 1,     /**< a location that is not usable */
+  ZV_CAUSE_LOOKUP = 2,       /**< the host has no address */
+  ZV_CAUSE_CONNECT = 3,      /**< no address of the host answered */
+  ZV_CAUSE_SILENCE = 4,      /**< the peer was silent for too long */
+  ZV_CAUSE_TIME = 5,         /**< the time for the whole run is over */
+  ZV_CAUSE_SPEED = 6,        /**< the body moved too slowly */
+  ZV_CAUSE_CANCELLED = 7,    /**< zv_transfer_cancel(), or the watch said so */
+  ZV_CAUSE_CLOSED = 8,       /**< the connection ended too early */
+  ZV_CAUSE_PROTOCOL = 9,     /**< the peer broke the rules of its protocol */
+  ZV_CAUSE_LOGIN = 10,       /**< user or password were refused */
+  ZV_CAUSE_REFUSED_NOW = 11, /**< refused for now: worth another try later */
+  ZV_CAUSE_REFUSED = 12,     /**< refused for good */
+  ZV_CAUSE_LOCAL = 13,       /**< a local file, or the local machine */
+  ZV_CAUSE_DISK_FULL = 14,   /**< no space left for the local file */
+  ZV_CAUSE_SAME_FILE = 15,   /**< source and destination are one file */
+  ZV_CAUSE_LANDING = 16,     /**< the destination cannot be replaced whole; see the reason */
+  ZV_CAUSE_EXISTS = 17,      /**< the destination exists, and #ZV_TRANSFER_KEEP is set */
+  ZV_CAUSE_TOO_LARGE = 18,   /**< larger than #ZV_TRANSFER_SIZE */
+  ZV_CAUSE_MEMORY = 19,      /**< memory ran out */
+  ZV_CAUSE_ENCRYPTION = 20   /**< the connection cannot be encrypted as it must be */
+};
+
+/**
+ * Called while a run goes on, in its own thread, at least four times a second.
+ *
+ * It must not throw, and not end the handle or start it again.
+ *
+ * @param context what zv_transfer_watch() was given.
+ * @param done    bytes of the file that have moved.
+ * @param total   bytes that the file has; -1 while that is not known.
+ * @return 0 to go on; anything else cancels.
+ */
+typedef int (*transfer_watch_t)(void* context, int64_t done, int64_t total);
+
+/**
+ * Make a handle.
+ *
+ * @return the handle, to be given back with zv_transfer_destroy(); NULL when memory ran out.
+ * @par Thread safety
+ *   Safe from any thread. One handle is for one thread at a time, except where a function says
+ *   otherwise.
+ */
+ZV_API zv_transfer_t* zv_transfer_create(void);
+
+/**
+ * Give a handle back, and overwrite its logins in memory.
+ *
+ * @param transfer the handle, which must not run; or NULL, which does nothing.
+ * @return 0, always.
+ * @par Thread safety
+ *   Safe from any thread, for distinct handles.
+ */
+ZV_API int zv_transfer_destroy(zv_transfer_t* transfer);
+
+/**
+ * Set an option for the runs to come.
+ *
+ * @param transfer the handle.
+ * @param option   one of #zv_transfer_option.
+ * @param value    times from 0 to 2,147,483,647 ms; a speed or a size from 0; a choice 0 or 1. -1
+ *                 sets any option back to what it was at first.
+ * @return 1; 0, and nothing changes, for another option or value, or while the handle runs.
+ * @par Thread safety
+ *   As zv_transfer_create() says.
+ */
+ZV_API int zv_transfer_set(zv_transfer_t* transfer, int option, int64_t value);
+
+/**
+ * Give the user and the password for one side, so that they need not stand in a location.
+ *
+ * They win over the location's, and go to that host and port only. A local location has no use for
+ * them. The handle keeps a copy.
+ *
+ * @param transfer the handle.
+ * @param side     0 for the source, 1 for the destination.
+ * @param user     the user, as it is sent; NULL takes both back. One with a colon fails at a run
+ *                 with HTTP.
+ * @param password the password; NULL is "".
+ * @return 1; 0, and nothing changes, for another side, a text with CR or LF, no memory, or while
+ *         the handle runs.
+ * @par Thread safety
+ *   As zv_transfer_create() says.
+ */
+ZV_API int zv_transfer_login(zv_transfer_t* transfer, int side, const char* user,
+                             const char* password);
+
+/**
+ * Trust the certificates of a file, in place of the system's, in encrypted connections to come.
+ *
+ * The file is read now, and the handle keeps what it needs of it. It may hold authorities, and also
+ * a server's own certificate.
+ *
+ * @param transfer the handle.
+ * @param pem_file the path of a file with one certificate or more, each between the lines
+ *                 `BEGIN CERTIFICATE` and `END CERTIFICATE` (RFC 7468); anything else in it is
+ *                 passed over. It may have 16 MiB. NULL means the system's certificates again.
+ * @return 1; 0, and nothing changes, for a file that cannot be read, holds none, or is broken, for
+ *         no memory, or while the handle runs. zv_transfer_reset() keeps the trust.
+ * @par Thread safety
+ *   As zv_transfer_create() says.
+ */
+ZV_API int zv_transfer_trust(zv_transfer_t* transfer, const char* pem_file);
+
+/**
+ * Have the runs to come watched.
+ *
+ * @param transfer the handle.
+ * @param watch    called at least four times a second, once at the beginning, and once more at the
+ *                 end of a body with the final count; NULL takes it away.
+ * @param context  what it is called with.
+ * @return 1; 0, and nothing changes, while the handle runs.
+ * @par Thread safety
+ *   As zv_transfer_create() says.
+ */
+ZV_API int zv_transfer_watch(zv_transfer_t* transfer, transfer_watch_t watch, void* context);
+
+/**
+ * Copy the contents of one file to another location.
+ *
+ * A handle can run again and again, also after a failure. Where the transfer fails, a local
+ * destination that was there is as it was and a new one is not there, unless it is written in
+ * place (#ZV_TRANSFER_IN_PLACE); a file on a server may hold a part then, and the reason says so.
+ * Between two servers a second count of bytes begins at 0 once the first file has come.
+ *
+ * @param transfer the handle.
+ * @param from     the source; not `smtp://`.
+ * @param to       the destination.
+ * @return 0 when all of the file has arrived. #ZV_COPY_SOURCE_FAILED (-3) or
+ *         #ZV_COPY_DESTINATION_FAILED (-4) by the side of the step that failed; a run that begins
+ *         cancelled and a file that is too large count to the source. -1, and nothing changes, when
+ *         the handle runs already.
+ * @par Thread safety
+ *   As zv_transfer_create() says; a second run beside the first gives -1.
+ */
+ZV_API int zv_transfer_run(zv_transfer_t* transfer, const char* from, const char* to);
+
+/**
+ * Tell how far a run is.
+ *
+ * @param transfer the handle.
+ * @param done     receives the bytes of the file that have moved, in the last run when none goes
+ *                 on; may be NULL.
+ * @param total    receives the bytes that the file has, -1 while that is not known; may be NULL.
+ * @return 1 while the handle runs; 0 otherwise.
+ * @par Thread safety
+ *   Safe from any thread and from a signal handler, while the handle is there.
+ */
+ZV_API int zv_transfer_progress(const zv_transfer_t* transfer, int64_t* done, int64_t* total);
+
+/**
+ * End a run, and each that comes, until zv_transfer_reset().
+ *
+ * @param transfer the handle.
+ * @return 1, always.
+ * @par Thread safety
+ *   Safe from any thread and from a signal handler, while the handle is there.
+ */
+ZV_API int zv_transfer_cancel(zv_transfer_t* transfer);
+
+/**
+ * Forget a cancel and the last result; options, logins and the watch stay.
+ *
+ * @param transfer the handle.
+ * @return 1; 0, and nothing changes, while the handle runs.
+ * @par Thread safety
+ *   As zv_transfer_create() says.
+ */
+ZV_API int zv_transfer_reset(zv_transfer_t* transfer);
+
+/**
+ * Tell why the last run failed, for a program to act on.
+ *
+ * @param transfer the handle, which must not run.
+ * @param number   receives the code of the reply, the HTTP status, or errno's number for an error
+ *                 of the system, on both platforms; 0 where nothing goes with the cause. May be
+ *                 NULL.
+ * @return one of #zv_transfer_cause; #ZV_CAUSE_NONE after a success and before the first run.
+ * @par Thread safety
+ *   As zv_transfer_create() says.
+ */
+ZV_API int zv_transfer_cause(const zv_transfer_t* transfer, int* number);
+
+/**
+ * Tell why the last run failed, for a person.
+ *
+ * One line of English: the step and what it met, "RETR /pub/a.bin: 550 No such file.". What a
+ * server said, and a file's name, have `?` in place of control characters. A password is never
+ * shown.
+ *
+ * @param transfer the handle, which must not run.
+ * @param buf      receives the text, "" after a success; what does not fit is cut.
+ * @param size     room in `buf`, in bytes.
+ * @return the length of the text in `buf`, as zv_strncpy() counts.
+ * @par Thread safety
+ *   As zv_transfer_create() says.
+ */
+ZV_API size_t zv_transfer_reason(const zv_transfer_t* transfer, char* buf, size_t size);
 
 /** @} */
 

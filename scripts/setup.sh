@@ -2,13 +2,16 @@
 # Sourced by the scripts beside it, from the top of the tree: gets what they need from a Debian
 # machine when it is missing, and says so.
 
-build_packages=(cmake ninja-build g++ binutils pkgconf python3 googletest libcli11-dev libstb-dev)
-server_packages=(nginx-light vsftpd python3-aiosmtpd)
-test_packages=("${build_packages[@]}" "${server_packages[@]}" attr valgrind)
+build_packages=(cmake ninja-build g++ binutils pkgconf python3 googletest libcli11-dev libstb-dev
+    libssl-dev)
+server_packages=(nginx-light vsftpd python3-aiosmtpd openssl)
+test_packages=("${build_packages[@]}" "${server_packages[@]}" attr valgrind locales)
 windows_packages=(g++-mingw-w64-x86-64-posix wine64 llvm)
+cross_packages=(g++-aarch64-linux-gnu g++-s390x-linux-gnu g++-riscv64-linux-gnu qemu-user-static)
 lint_packages=(clang clang-format clang-tidy libclang-rt-14-dev cppcheck shellcheck)
 bench_packages=(libbenchmark-dev libapr1-dev libaprutil1-dev libglib2.0-dev libcurl4-openssl-dev)
-docs_packages=(doxygen)
+docs_packages=(doxygen python3)
+msvc_packages=(clang lld libwine-dev)
 package_packages=(dpkg-dev file gzip man-db util-linux abigail-tools)
 
 fail() {

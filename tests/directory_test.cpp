@@ -203,21 +203,22 @@ TEST(DirectorySelect, HiddenEntries) {
   EXPECT_EQ(scan(scratch.path(), nullptr, nullptr, 0, 0).names, (Names{"kept"}));
 }
 
-#ifndef _WIN32
-// Wine shows links to the Windows build as what they lead to, and deletes that, so their rules are
-// shown here alone.
+// Wine shows only links to folders, and takes them away by what they lead to.
 TEST(DirectoryScan, LinksAreEntriesAndAreNotFollowed) {
   const ScratchFolder scratch;
   scratch.make_file("outside/kept");
   scratch.make_file("top/file");
-  std::filesystem::create_symlink("../outside", scratch.path("top/to-folder"));
-  std::filesystem::create_symlink("../outside/kept", scratch.path("top/to-file"));
-  std::filesystem::create_symlink("nowhere", scratch.path("top/dangling"));
-  std::filesystem::create_symlink("top", scratch.path("to-top"));
+  if (!make_link("../outside", scratch.path("top/to-folder"))) GTEST_SKIP() << "no links here";
+  make_link("top", scratch.path("to-top"));
+  if (!under_wine()) {
+    make_link("../outside/kept", scratch.path("top/to-file"));
+    make_link("nowhere", scratch.path("top/dangling"));
+  }
 
   const std::string top = scratch.path("to-top");  // the top itself is followed
+  const Names with_files = {top + "/dangling", top + "/file", top + "/to-file", top + "/to-folder"};
   EXPECT_EQ(sorted(scan(top, nullptr, nullptr, 0, 1).names),
-            (Names{top + "/dangling", top + "/file", top + "/to-file", top + "/to-folder"}));
+            under_wine() ? (Names{top + "/file", top + "/to-folder"}) : with_files);
   const dirsel_t folders = {"*", nullptr, nullptr, 1, 0};
   EXPECT_EQ(select(top, folders), (Names{"to-folder"}));
 
@@ -225,11 +226,12 @@ TEST(DirectoryScan, LinksAreEntriesAndAreNotFollowed) {
   EXPECT_EQ(zv_rmpath(top.c_str()), 0);
   EXPECT_EQ(zv_rmpath((top + "/").c_str()), 0);
   EXPECT_TRUE(scratch.exists("top/file"));
-  EXPECT_EQ(zv_rmpath(scratch.path("top").c_str()), 1);
-  EXPECT_FALSE(scratch.exists("top"));
+  EXPECT_EQ(zv_rmpath(scratch.path("top").c_str()), !under_wine());
+  EXPECT_EQ(scratch.exists("top"), under_wine());
   EXPECT_TRUE(scratch.exists("outside/kept"));
 }
 
+#ifndef _WIN32
 TEST(DirectoryScan, NamesWithABackslashAreTakenAsTheyAre) {
   const ScratchFolder scratch;
   scratch.make_file("top/a\\b/inner");

@@ -14,7 +14,7 @@
 
 class Variable {
  public:
-  // No value: the variable is not set.
+  // No value: the variable is not set. An empty one is of a kind that Windows only inherits.
   Variable(std::string name, const std::optional<std::string>& value) : name_(std::move(name)) {
     if (const char* const old = std::getenv(name_.c_str())) old_ = old;
     set(value);
@@ -25,7 +25,11 @@ class Variable {
 
   void set(const std::optional<std::string>& value) {
 #ifdef _WIN32
-    _putenv_s(name_.c_str(), value.value_or("").c_str());
+    const bool empty = value && value->empty();
+    _putenv_s(name_.c_str(), empty ? "x" : value.value_or("").c_str());
+    if (!empty) return;
+    *std::getenv(name_.c_str()) = '\0';
+    SetEnvironmentVariableA(name_.c_str(), "");  // from where Wine takes them anew
 #else
     if (value)
       setenv(name_.c_str(), value->c_str(), 1);

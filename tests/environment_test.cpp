@@ -48,13 +48,13 @@ TEST_F(Environment, PutAndGet) {
 
 TEST_F(Environment, ManyVariables) {
   constexpr int count = 2000;
-  const auto name = [](int i) { return "Name" + std::to_string(i); };
+  const auto name = [](int i) { return "Variable" + std::to_string(i); };
   for (int i = 0; i < count; ++i) zv_putenv_private(name(i).c_str(), name(i).c_str(), 0);
   for (int i = 0; i < count; i += 3) zv_putenv_private(name(i).c_str(), nullptr, 0);
   for (int i = 1; i < count; i += 3) zv_putenv_private(name(i).c_str(), "more", 1);
   for (int i = 0; i < count; ++i) {
     const std::string expected[] = {"none", name(i) + "|more|", name(i) + "|"};
-    ASSERT_EQ(private_values("nAME" + std::to_string(i)), expected[i % 3]);
+    ASSERT_EQ(private_values("vARIABLE" + std::to_string(i)), expected[i % 3]);
   }
 }
 

@@ -14,7 +14,7 @@ namespace {
 using Texts = std::vector<std::string>;
 
 struct Plugin {
-  // Its entries have ';' behind each.
+  // Its entries have ';' after each.
   explicit Plugin(const std::string& entries) : formats(entries) { record.formats = formats.list; }
 
   bool matches(const std::string& path) { return zv_plugin_match_fmt(&record, path.c_str()) == 1; }
@@ -35,7 +35,7 @@ TEST(Format, FilesMatchByTheirNames) {
       {"Notes|readme*|NEWS|[0-9]?.txt|",
        {"README", "readme.md", "news", "7x.TXT"},
        {"my_readme", "news2", "xx.txt"}},
-      {"No name|||", {"", "a/.."}, {"x"}},
+      {"No name|||", {"a/.."}, {"", "x"}},
       {"Unclosed|.png|.jpg", {"x.png"}, {"x.jpg"}},
       {"PNG image", {}, {"x.png", "PNG image"}},
       {"|.png|", {"x.png"}, {}},
@@ -71,7 +71,8 @@ TEST(Format, AnyPatternAsTheMatcherSees) {
     const std::string expanded = pattern.starts_with('.') ? '*' + pattern : pattern;
     const bool expected = zv_strpat(lower(name).c_str(), lower(expanded).c_str()) == 1;
     matched += expected;
-    Plugin plugin("x|" + pattern + "|;");
+    const std::string front(random() % 20, 'a'), others = random() % 2 == 0 ? "" : "other7|.no|";
+    Plugin plugin(front + '|' + others + pattern + "|;");
     ASSERT_EQ(plugin.matches("dir/" + name), expected) << name << " and " << pattern;
   }
   EXPECT_GT(matched, 1000);
@@ -86,6 +87,8 @@ TEST(Format, TheFirstPluginWins) {
   EXPECT_EQ(zv_plugin_get_entry_by_fmt(plugins, "a/photo.JPG"), &picture.record);
   for (const char* const path : {"photo.gif", "", static_cast<const char*>(nullptr)})
     EXPECT_EQ(zv_plugin_get_entry_by_fmt(plugins, path), nullptr);
+  EXPECT_EQ(zv_plugin_get_entry_by_fmt(nullptr, "a/photo.png"), nullptr);
+  EXPECT_EQ(zv_plugin_match_fmt(&text.record, nullptr), 0);
 
   List all("kept;");
   EXPECT_EQ(zv_plugin_formats(plugins, &all.list), 4);
@@ -108,9 +111,11 @@ TEST(Format, Composite) {
       {"PNG image|.png|;none;", 1, "", "All recognized formats|.png|;"},
       {"PNG image|.png|;none;", 0, "Images", "Images|;"},
       {"PNG image|.png|;none;", 2, "Images", ""},
+      {"A|.a|;", 9, "x", "x|.a|;"},
       {"A|.a|.b;C|.c|.d;", -1, "x", "x|.a|.b.c|;"},
       {"A||.a||;", -1, "x", "x||.a|;"},
       {"A|.a|;B|.A|;", -1, ".a", ".a|.a|;"},
+      {"A|.a|;B|.b|;", 3, "x", "x|.a|.b|;"},
       {"", -1, "x", ""},
   };
   for (const auto& c : cases) {

@@ -11,6 +11,7 @@ TEST(Memory, SizeZeroIsARealBlock) {
   int ok = -1;
   void* const blocks[] = {zv_malloc(0), zv_calloc(0), zv_realloc(nullptr, 0, &ok),
                           zv_dalloc("ab", 0), zv_dalloc(nullptr, 16)};
+  for (void* const block : blocks) ASSERT_NE(block, nullptr);
   EXPECT_EQ(ok, 1);
   EXPECT_EQ(*static_cast<char*>(blocks[1]), '\0');
   EXPECT_EQ(*static_cast<char*>(blocks[3]), 'a');

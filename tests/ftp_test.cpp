@@ -16,7 +16,7 @@ using namespace scripted;
 
 const std::string anonymous = "USER anonymous\r\nPASS zarvo@zarvo.test\r\n";
 
-enum Place { greeting, user, password, type, passive, retrieval, data, stored, end };
+enum Place { greeting, user, password, type, size, passive, retrieval, data, stored, end };
 
 // The steps of a download.
 Steps steps_with(Place place, const std::string& said) {
@@ -96,8 +96,8 @@ TEST(Ftp, ALineThatContinuesIsWaitedBehind) {
 
 TEST(Ftp, Uploads) {
   const ScratchFolder folder;
-  for (const size_t size : {0u, 1u, 5000000u}) {
-    const std::string content(size, 'x');
+  for (const size_t length : {0u, 1u, 5000000u}) {
+    const std::string content(length, 'x');
     DialogueServer server(ftp({{"STOR", "150 send\r\n"}, {data_in, ""}}));
     EXPECT_EQ(zv_copy(folder.make_file("file", content).c_str(),
                       server.url("ftp", "/in/f", "u:p@").c_str()),

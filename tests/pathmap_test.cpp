@@ -141,6 +141,7 @@ TEST(SearchPath, Locates) {
   {
     const WorkingDirectory inside(scratch.path("two"));
     path.set(scratch.path("one"));
+    EXPECT_EQ(locate("/"), scratch.path("one"));
     EXPECT_EQ(locate("only"), "none");
     path.set(scratch.path("one") + ";");
     EXPECT_EQ(locate("only"), "only");  // an empty element is the working directory

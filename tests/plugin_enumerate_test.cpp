@@ -31,7 +31,7 @@ class Enumerate : public testing::Test {
     return count;
   }
 
-  // The records' file names, ';' behind each; gives the records back.
+  // The records' file names, ';' after each; gives the records back.
   std::string take_names() {
     std::string names;
     for (zv_plugin_t** record = plugins; record != nullptr && *record != nullptr; ++record) {
@@ -71,8 +71,8 @@ TEST_F(Enumerate, FolderComesFromThePrivateEnvironment) {
   folder.make_folder("empty");
   for (const char* const useless : {"empty", "missing", "/..", "own/img_own.dll"}) {
     use(useless);
-    EXPECT_EQ(run(), 0) << useless;
-    EXPECT_EQ(plugins, &nothing);
+    ASSERT_EQ(run(), 0) << useless;
+    ASSERT_EQ(plugins, &nothing);
     EXPECT_EQ(report, "");
   }
 }
@@ -131,6 +131,7 @@ TEST_F(Enumerate, CandidatesAndTheirReports) {
   List listed;  // in the platform's order
   zv_strlist_free(listed.list, -1);
   zv_dir_scan(folder.path().c_str(), &listed.list, nullptr, nullptr, 0, 0);
+  ASSERT_NE(listed.list, nullptr);
   for (char** name = listed.list; *name != nullptr; ++name) {
     const auto found = outcomes.find(*name);
     if (found == outcomes.end()) continue;
@@ -141,7 +142,7 @@ TEST_F(Enumerate, CandidatesAndTheirReports) {
         *outcome.reason == '\0' ? "ok\n" : std::string("\n\trejected: ") + outcome.reason + '\n';
     if (outcome.formats >= 0) accepted += found->first + ';';
   }
-  EXPECT_EQ(run(), 6);
+  ASSERT_EQ(run(), 6);
   EXPECT_EQ(report, reports);
   for (int i = 0; i < 6; ++i) {
     EXPECT_EQ(plugins[i]->refs, 0);
@@ -153,7 +154,7 @@ TEST_F(Enumerate, CandidatesAndTheirReports) {
 
 TEST_F(Enumerate, RangeAndKeepReachThePlugins) {
   folder.add("accept", "img_a.dll");
-  EXPECT_EQ(run("img.x", 2, 9, 1), 1);
+  ASSERT_EQ(run("img.x", 2, 9, 1), 1);
   EXPECT_EQ(plugins[0]->refs, 1);
   EXPECT_EQ(take_events(), "load entry(img.x,2,9,-1) formats");
   EXPECT_EQ(take_names(), "img_a.dll;");

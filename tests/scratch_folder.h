@@ -1,4 +1,5 @@
-// A folder of a test's own in the system's temporary folder, removed with all it holds at the end.
+// A folder of a test's own in the system's temporary folder, or in a shorter one where that leaves
+// no room for the tests' long paths; removed with all it holds at the end.
 #ifndef ZARVO_TESTS_SCRATCH_FOLDER_H
 #define ZARVO_TESTS_SCRATCH_FOLDER_H
 
@@ -11,9 +12,12 @@
 class ScratchFolder {
  public:
   ScratchFolder() {
+    std::filesystem::path base = std::filesystem::canonical(std::filesystem::temp_directory_path());
+    for (const char* const shorter : {"/var/tmp", "/tmp"})
+      if (base.string().size() > 60 && std::filesystem::exists(shorter)) base = shorter;
     std::random_device random;
     do {
-      path_ = std::filesystem::temp_directory_path() / ("zarvo-test-" + std::to_string(random()));
+      path_ = base / ("zarvo-test-" + std::to_string(random()));
     } while (!std::filesystem::create_directory(path_));
   }
   ~ScratchFolder() {

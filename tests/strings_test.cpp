@@ -6,6 +6,7 @@
 #include <random>
 #include <string>
 
+#include "environment.h"
 #include "guarded.h"
 #include "zarvo.h"
 
@@ -142,11 +143,15 @@ TEST(Edit, Case) {
     lower += static_cast<char>(i >= 'A' && i <= 'Z' ? i + 0x20 : i);
     upper += static_cast<char>(i >= 'a' && i <= 'z' ? i - 0x20 : i);
   }
-  for (size_t length : {0u, 1u, 15u, 100u, 255u}) {
-    const auto result = static_cast<int64_t>(length);
-    expect_edit(every.substr(0, length), zv_strlwr, result, lower.substr(0, length));
-    expect_edit(every.substr(0, length), zv_strupr, result, upper.substr(0, length));
+  for (const char* const locale : {"C", "C.UTF-8"}) {
+    std::setlocale(LC_CTYPE, locale);
+    for (size_t length : {0u, 1u, 15u, 100u, 255u}) {
+      const auto result = static_cast<int64_t>(length);
+      expect_edit(every.substr(0, length), zv_strlwr, result, lower.substr(0, length));
+      expect_edit(every.substr(0, length), zv_strupr, result, upper.substr(0, length));
+    }
   }
+  std::setlocale(LC_CTYPE, "C");
 }
 
 TEST(NoCase, Compare) {
@@ -213,12 +218,11 @@ TEST(NoCase, SearchOfALongText) {
   }
 }
 
-// With a code page on Windows; on Linux where such a locale is installed.
+// With a code page on Windows; on Linux with a locale that the build has made.
 TEST(NoCase, FollowsTheLocale) {
-  const char* locale = nullptr;
-  for (const char* name : {".1252", "de_DE.ISO-8859-1", "en_US.ISO-8859-1"})
-    if (locale == nullptr) locale = std::setlocale(LC_CTYPE, name);
-  if (locale == nullptr) GTEST_SKIP() << "no 8-bit locale here";
+  const Variable folder("LOCPATH", ZARVO_LOCALES);
+  if (!std::setlocale(LC_CTYPE, ".1252") && !std::setlocale(LC_CTYPE, "latin1"))
+    GTEST_SKIP() << "no 8-bit locale here";
   const char name[] = "caf\xC9 X";
   EXPECT_EQ(zv_stricmp(name, "CAF\xE9 x"), 0);
   EXPECT_EQ(sign(zv_strnicmp(name, "CAF\xE8", 4)), 1);
@@ -226,6 +230,12 @@ TEST(NoCase, FollowsTheLocale) {
   EXPECT_EQ(zv_strichr(name, 0xE9), name + 3);
   expect_edit(name, zv_strlwr, 6, "caf\xE9 x");
   expect_edit("caf\xE9 x", zv_strupr, 6, "CAF\xC9 X");
+  expect_edit(std::string(100, '\xC9'), zv_strlwr, 100, std::string(100, '\xE9'));
+  zv_putenv_private(name, "v", 0);
+  char* const values = zv_getenv_private("Caf\xE9 x");
+  EXPECT_STREQ(values, "v");
+  zv_free(values);
+  zv_putenv_private(nullptr, nullptr, 0);
   std::setlocale(LC_CTYPE, "C");
 }
 

@@ -62,6 +62,24 @@ TEST(StringList, InsertAndRemove) {
   zv_strlist_free(fresh, 1);
 }
 
+// The list ends after that many entries, and those after it stay as they are.
+TEST(StringList, CountBelowTheRealOne) {
+  List list("a;b;a;d;");
+  char* const after[] = {list.list[2], list.list[3]};
+  EXPECT_EQ(zv_strlist_set(list.list, 2), 0);
+  EXPECT_EQ(zv_strlist_remove(list.list, 2, 2), nullptr);
+  zv_free(zv_strlist_remove(list.list, 2, 0));
+  EXPECT_EQ(list.text(), "b;");
+  EXPECT_EQ(list.list[2], after[0]);
+  ASSERT_EQ(zv_strlist_insert(&list.list, 1, 0, "b"), 1);
+  EXPECT_EQ(list.list[3], after[1]);
+  list.list[2] = after[0];
+  EXPECT_EQ(zv_strlist_set(list.list, 2), 1);
+  EXPECT_EQ(list.text(), "b;");
+  EXPECT_EQ(list.list[2], after[0]);
+  for (char* const text : after) zv_free(text);
+}
+
 TEST(StringList, ReplaceAndReduce) {
   List list("a;b;d;");
   EXPECT_EQ(zv_strlist_replace(list.list, 1, "longer"), 1);
@@ -77,7 +95,7 @@ TEST(StringList, CatMovesTheTexts) {
   List list("a;b;");
   char** other = nullptr;
   ASSERT_EQ(zv_strlist(&other, "d;e;", ';'), 2);
-  EXPECT_EQ(zv_strlist_cat(&list.list, -1, other, -1), 4);
+  ASSERT_EQ(zv_strlist_cat(&list.list, -1, other, -1), 4);
   EXPECT_EQ(list.text(), "a;b;d;e;");
   EXPECT_EQ(list.list[2], other[0]);
   other[0] = nullptr;
@@ -86,7 +104,7 @@ TEST(StringList, CatMovesTheTexts) {
 
   char** fresh = nullptr;
   ASSERT_EQ(zv_strlist(&other, "d;", ';'), 1);
-  EXPECT_EQ(zv_strlist_cat(&fresh, 0, other, 1), 1);
+  ASSERT_EQ(zv_strlist_cat(&fresh, 0, other, 1), 1);
   EXPECT_EQ(joined(fresh), "d;");
   zv_free(other);
   zv_strlist_free(fresh, 1);
@@ -129,7 +147,7 @@ TEST(StringList, SetKeepsTheFirst) {
       const char* const names[] = {"name.", "Name.", "NAME."};
       before.push_back(names[number % 3] + std::to_string(number / 3));
       for (List* const list : {&exact, &nocase})
-        zv_strlist_insert(&list->list, -1, -1, before.back().c_str());
+        ASSERT_EQ(zv_strlist_insert(&list->list, -1, -1, before.back().c_str()), 1);
     }
     const int removed = zv_strlist_set(exact.list, -1);
     EXPECT_EQ(exact.text(), without_duplicates(before, false));

@@ -1,6 +1,7 @@
 // Everything that a process has once, used on many threads at a time, and twenty copies at once.
 // The thread sanitizer runs it too.
 #include <gtest/gtest.h>
+#include <pthread.h>
 
 #include <atomic>
 #include <filesystem>
@@ -135,6 +136,53 @@ TEST(Threads, TwentyCopies) {
   });
   EXPECT_EQ(scripted::open_handles(), handles);
   EXPECT_TRUE(std::filesystem::is_empty(temporary.path()));
+}
+
+// Runs the work on a thread whose stack is as small as those of servers with thousands of them. A
+// sanitizer's frames are larger.
+template <class Work>
+void on_small_stack(Work work) {
+#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+  constexpr size_t size = size_t{1} << 20;
+#else
+  constexpr size_t size = size_t{64} << 10;
+#endif
+  pthread_attr_t attributes;
+  pthread_attr_init(&attributes);
+  ASSERT_EQ(pthread_attr_setstacksize(&attributes, size), 0);
+  pthread_t thread;
+  const auto run = [](void* called) -> void* {
+    (*static_cast<Work*>(called))();
+    return nullptr;
+  };
+  ASSERT_EQ(pthread_create(&thread, &attributes, run, &work), 0);
+  pthread_join(thread, nullptr);
+  pthread_attr_destroy(&attributes);
+}
+
+// What calls itself, looks up a name, loads a library or builds a message.
+TEST(Threads, SmallStack) {
+  const PluginFolder folder;
+  folder.add("accept", "img_a.dll");
+  zv_putenv_private("img", folder.path().c_str(), 0);
+  const std::string top = folder.path("deep");
+  std::string deepest = top;
+  while (deepest.size() < 240) deepest += "/x";  // Windows takes no more than 247 for a folder
+  on_small_stack([&] {
+    EXPECT_EQ(zv_mkpath(deepest.c_str()), 1);
+    char** list = nullptr;
+    EXPECT_EQ(zv_dir_scan(top.c_str(), &list, nullptr, nullptr, 1, 1),
+              static_cast<int>(deepest.size() - top.size()) / 2);
+    zv_strlist_free(list, -1);
+    EXPECT_EQ(zv_rmpath(top.c_str()), 1);
+    testing::internal::CaptureStderr();
+    use_plugin(0);
+    testing::internal::GetCapturedStderr();
+    EXPECT_NE(host_answers(), "");
+  });
+  zv_putenv_private(nullptr, nullptr, 0);
+  for (const scripted::Dialogue& dialogue : scripted::dialogues())
+    on_small_stack([&] { EXPECT_TRUE(copies_along(dialogue)) << dialogue.name; });
 }
 
 }  // namespace

@@ -55,6 +55,14 @@ TEST(CopyLocal, NamesInEveryForm) {
   std::replace(from.begin(), from.end(), '/', '\\');
   EXPECT_EQ(copy(from, folder.path("e")), 0);
   EXPECT_EQ(folder.content("e"), "x");
+#ifndef _WIN32  // a name that is there as it is written
+  folder.make_file("a\\b", "y");
+  folder.make_folder("f");
+  for (const std::string& form : {folder.path("a\\b"), "file://" + folder.path("a\\b")}) {
+    EXPECT_EQ(copy(form, folder.path("f\\g")), 0);
+    EXPECT_EQ(folder.content("f/g"), "y");
+  }
+#endif
 }
 
 TEST(CopyLocal, Failures) {

@@ -114,8 +114,13 @@ TEST(Wildcard, AgreesWithItsDefinition) {
   int matched = 0;
   constexpr int cases = 200000;
   for (int i = 0; i < cases; ++i) {
-    const std::string text = generate.text(generate.below(12));
-    const std::string pattern = generate.pattern_for(text);
+    std::string text = generate.text(generate.below(12));
+    std::string pattern = generate.pattern_for(text);
+    // In a long text the end is looked at first.
+    if (i % 4 == 0) {
+      text.insert(0, 64, 'a');
+      pattern.insert(0, "*");
+    }
     const bool expected = WildcardDefinition::matches(text, pattern);
     matched += expected ? 1 : 0;
     ASSERT_EQ(zv_strpat(text.c_str(), pattern.c_str()), expected ? 1 : 0)

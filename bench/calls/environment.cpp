@@ -1,9 +1,12 @@
 // The private environment as it grows, read by one thread and by four.
 #include <unistd.h>
 
+#include <cctype>
 #include <cstdlib>
 #include <cstring>
+#include <mutex>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 #include "frame/measure.h"
@@ -14,6 +17,44 @@ namespace {
 const bench::Item item("environment");
 
 const char* const value = "the value of a variable";
+
+// What an application would write itself: a map with a lock, names in any case, and copies.
+class LockedMap {
+ public:
+  void put(const char* name) {
+    const std::lock_guard lock(mutex_);
+    values_[lowered(name)] = std::string(value) + '\0';
+  }
+  size_t get(const char* name) {
+    char* copy = nullptr;
+    {
+      const std::lock_guard lock(mutex_);
+      const auto found = values_.find(lowered(name));
+      if (found == values_.end()) return 0;
+      copy = static_cast<char*>(std::malloc(found->second.size() + 1));
+      std::memcpy(copy, found->second.c_str(), found->second.size() + 1);
+    }
+    const size_t size = std::strlen(copy);
+    std::free(copy);
+    return size;
+  }
+  void clear() { values_.clear(); }
+
+ private:
+  static std::string lowered(std::string name) {
+    for (char& ch : name) ch = static_cast<char>(std::tolower(static_cast<unsigned char>(ch)));
+    return name;
+  }
+
+  std::mutex mutex_;
+  std::unordered_map<std::string, std::string> values_;
+};
+
+LockedMap locked_map;
+
+size_t get_from_map(const char* name) {
+  return locked_map.get(name);
+}
 
 // The process's environment, replaced by one of so many variables.
 class Environment {
@@ -29,7 +70,11 @@ class Environment {
   void take() {
     environ = pointers_.data();
     zv_putenv_private(nullptr, nullptr, 0);
-    for (const std::string& name : names_) zv_putenv_private(name.c_str(), value, 0);
+    locked_map.clear();
+    for (const std::string& name : names_) {
+      zv_putenv_private(name.c_str(), value, 0);
+      locked_map.put(name.c_str());
+    }
   }
 
   // Sixteen variables from all over it.
@@ -83,6 +128,7 @@ template <int count>
 void add_gets(int threads) {
   add_get<count>("zarvo", threads, get_private);
   add_get<count>("getenv", threads, get_from_process);
+  add_get<count>("std::unordered_map with a mutex", threads, get_from_map);
 }
 
 struct Emptied {
@@ -93,6 +139,11 @@ void add_put(int count) {
   std::vector<std::string> names;
   for (int i = 0; i < count; ++i) names.push_back("VARIABLE_" + std::to_string(i));
   zv_putenv_private(nullptr, nullptr, 0);
+  item.add("put all @" + std::to_string(count), "std::unordered_map with a mutex", [=] {
+    LockedMap map;
+    for (const std::string& name : names) map.put(name.c_str());
+    return names.size();
+  });
   item.add("put all @" + std::to_string(count), "zarvo", [=] {
     const Emptied emptied;
     uint64_t made = 0;

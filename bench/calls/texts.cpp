@@ -3,6 +3,7 @@
 #include <strings.h>
 
 #include <algorithm>
+#include <bit>
 #include <cctype>
 #include <cstring>
 #include <string>
@@ -113,6 +114,21 @@ void add_search(const std::string& what, const std::string& text, const std::str
   });
 }
 
+void add_letter(size_t size) {
+  const std::string text = std::string(size - 1, '.') + 'Q';
+  const std::string what = sized("search for a letter without case", size);
+  item.add(what, "zarvo", [=] { return zv_strichr(text.c_str(), 'q') - text.c_str(); });
+  item.add(what, "strpbrk", [=] { return std::strpbrk(text.c_str(), "qQ") - text.c_str(); });
+}
+
+// 0110 1001...: each half is the other one's opposite, which sums and polynomials of the bytes take
+// for the same.
+std::string thue_morse(size_t size) {
+  std::string text(size, 'a');
+  for (size_t i = 0; i < size; ++i) text[i] = std::popcount(i) % 2 == 0 ? 'a' : 'b';
+  return text;
+}
+
 void add_compare(size_t size) {
   const std::string a = prose(size);
   std::string b = a;
@@ -142,6 +158,13 @@ void add_case(size_t size) {
   const std::string text = prose(size);
   const std::string what = sized("upper case", size);
   add_edit(what, "zarvo", text, zv_strupr);
+  const std::string result = [&text] {
+    std::string copy = text;
+    zv_strupr(copy.data());
+    return copy;
+  }();
+  add_edit(what, "limit memcpy", text,
+           [=](char* s) { std::memcpy(s, result.c_str(), result.size()); });
   add_edit(what, "g_ascii_strup", text, [](char* s) {
     char* const upper = g_ascii_strup(s, -1);
     std::memcpy(s, upper, std::strlen(upper));
@@ -184,6 +207,7 @@ void add_replace(const char* name, size_t size, const std::string& needle,
 void bench::add_cases() {
   for (const size_t size : {size_t{64}, size_t{64} << 10}) {
     add_search(sized("search without case", size), prose(size - 6) + "nEEdle", "needle");
+    add_letter(size);
     add_compare(size);
     add_trim(size);
     add_case(size);
@@ -194,4 +218,13 @@ void bench::add_cases() {
   const std::string letters(64 << 10, 'a');
   const std::string needle = std::string(15, 'a') + 'b' + std::string(48, 'a');
   add_search("search without case, a needle nearly everywhere", letters + needle, needle);
+  for (const size_t half : {size_t{1} << 18, size_t{1} << 20}) {
+    const std::string text = thue_morse(2 * half);
+    const std::string what = "search without case, Thue-Morse @" + std::to_string(2 * half);
+    const std::string sought = text.substr(half, half);
+    item.add(what, "zarvo",
+             [=] { return zv_stristr(text.c_str(), sought.c_str()) - text.c_str(); });
+    item.add(what, "strcasestr",
+             [=] { return strcasestr(text.c_str(), sought.c_str()) - text.c_str(); });
+  }
 }

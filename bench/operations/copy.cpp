@@ -30,6 +30,13 @@ Row copy_row(const std::string& name, const std::string& from, const std::string
        [](const std::string& source, const std::string& destination) {
          return zv_copy(source.c_str(), destination.c_str()) == 0;
        }},
+      {"zarvo with a handle",
+       [](const std::string& source, const std::string& destination) {
+         zv_transfer_t* const handle = zv_transfer_create();
+         const bool copied = zv_transfer_run(handle, source.c_str(), destination.c_str()) == 0;
+         zv_transfer_destroy(handle);
+         return copied;
+       }},
       {"std::filesystem",
        [](const std::string& source, const std::string& destination) {
          std::error_code error;

@@ -49,6 +49,18 @@ bool load_with_dlopen(const std::string& path) {
   return dlclose(library) == 0 && found;
 }
 
+// What an enumeration asks each plugin, and nothing else of it.
+bool ask_with_dlopen(const std::string& path) {
+  void* const library = dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL);
+  if (library == nullptr) return false;
+  int version = -1;
+  const auto entry = reinterpret_cast<zv_plugin_entry_t>(dlsym(library, "zv_plugin"));
+  plugin_t* const plugin = entry("bench", 1, 5, &version);
+  const bool has_formats = *plugin->formats() != '\0';
+  plugin->release(plugin);
+  return dlclose(library) == 0 && has_formats;
+}
+
 bool load_with_gmodule(const std::string& path) {
   GModule* const library = g_module_open(path.c_str(), G_MODULE_BIND_LOCAL);
   void* entry = nullptr;
@@ -78,6 +90,7 @@ void measure(Runner& runner) {
   runner.measure({"enumeration/" + std::to_string(count) + " plugins",
                   {{"zarvo", [count] { return enumerate_with_zarvo(count); }},
                    {"dlopen", each(load_with_dlopen)},
+                   {"dlopen and the plugin's functions", each(ask_with_dlopen)},
                    {"gmodule", each(load_with_gmodule)}}});
 }
 

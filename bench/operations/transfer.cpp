@@ -6,6 +6,7 @@
 #include <algorithm>
 #include <cstdlib>
 #include <filesystem>
+#include <functional>
 #include <iostream>
 
 #include "folder.h"
@@ -45,6 +46,8 @@ class Curl {
   }
   Curl(const Curl&) = delete;
   Curl& operator=(const Curl&) = delete;
+
+  void trust(const std::string& certificates) { set(CURLOPT_CAINFO, certificates.c_str()); }
 
   bool download(const std::string& url, const std::string& path) {
     FILE* const file = std::fopen(path.c_str(), "wb");
@@ -112,6 +115,13 @@ bool get_with_zarvo(const std::string& url, const std::string& path) {
   return false;
 }
 
+bool run_with_zarvo(const std::string& from, const std::string& to) {
+  zv_transfer_t* const handle = zv_transfer_create();
+  const bool good = zv_transfer_run(handle, from.c_str(), to.c_str()) == 0;
+  zv_transfer_destroy(handle);
+  return good;
+}
+
 // One file each way, by both.
 bool put_with_zarvo(const std::string& path, const std::string& url) {
   return zv_copy(path.c_str(), url.c_str()) == 0;
@@ -131,16 +141,22 @@ struct Places {
   std::vector<std::string> names;
 };
 
-template <class Zarvo, class Libcurl>
-Row way(const std::string& name, const Places& places, Zarvo zarvo, Libcurl libcurl) {
+using Copy = bool (*)(const std::string& from, const std::string& to);
+
+std::function<bool()> each(const Places& places, Copy copy) {
+  return [places, copy] {
+    return std::ranges::all_of(places.names, [&](const std::string& file) {
+      return copy(places.from + file, places.to + file);
+    });
+  };
+}
+
+template <class Libcurl>
+Row way(const std::string& name, const Places& places, Copy zarvo, Libcurl libcurl) {
   Row row = {.name = "transfer/" + name, .contenders = {}};
   row.clock = true;
-  row.contenders = {{"zarvo",
-                     [places, zarvo] {
-                       return std::ranges::all_of(places.names, [&](const std::string& file) {
-                         return zarvo(places.from + file, places.to + file);
-                       });
-                     }},
+  row.contenders = {{"zarvo", each(places, zarvo)},
+                    {"zarvo with a handle", each(places, run_with_zarvo)},
                     {"libcurl", [places, libcurl] {
                        Curl curl;
                        return std::ranges::all_of(places.names, [&](const std::string& file) {
@@ -176,15 +192,50 @@ void measure_ways(Runner& runner, const std::string& item, const std::string& ur
   std::filesystem::remove_all(server_folder);
 }
 
+// Each keeps one handle for all files: what it trusts is read once, and a session is used again.
+void measure_encrypted(Runner& runner, const Files& files) {
+  const WorkFolder work;
+  const std::string local = work.path("local") + "/";
+  const std::string server_folder = told("HTTP_ROOT") + "/bench";
+  const std::string url = "https://localhost:" + told("HTTPS_PORT") + "/bench/";
+  const std::vector<std::string> names =
+      write_files(server_folder, runner.scaled(files.count), files.size);
+  Row row = {.name = std::string("transfer/HTTPS GET, ") + files.name, .contenders = {}};
+  row.clock = true;
+  row.before = [local] { make_empty(local); };
+  row.contenders = {{"zarvo with a handle",
+                     [=] {
+                       zv_transfer_t* const handle = zv_transfer_create();
+                       zv_transfer_trust(handle, told("CERTIFICATES").c_str());
+                       const bool good = std::ranges::all_of(names, [&](const std::string& file) {
+                         return zv_transfer_run(handle, (url + file).c_str(),
+                                                (local + file).c_str()) == 0;
+                       });
+                       zv_transfer_destroy(handle);
+                       return good;
+                     }},
+                    {"libcurl", [=] {
+                       Curl curl;
+                       curl.trust(told("CERTIFICATES"));
+                       return std::ranges::all_of(names, [&](const std::string& file) {
+                         return curl.download(url + file, local + file);
+                       });
+                     }}};
+  runner.measure(row);
+  std::filesystem::remove_all(server_folder);
+}
+
 void measure_mail(Runner& runner) {
   const WorkFolder work;
   const MailServer server;
   const std::string path = work.path("attachment.bin");
   const std::string url = "smtp://127.0.0.1:" + std::to_string(server.port());
   write_file(path, 32 * kib * kib);
-  Row row = {"transfer/mail, 32 MiB",
-             {{"zarvo", [&] { return put_with_zarvo(path, url + "/somebody@localhost"); }},
-              {"libcurl", [&] { return Curl().mail(path, url); }}}};
+  Row row = {
+      "transfer/mail, 32 MiB",
+      {{"zarvo", [&] { return put_with_zarvo(path, url + "/somebody@localhost"); }},
+       {"zarvo with a handle", [&] { return run_with_zarvo(path, url + "/somebody@localhost"); }},
+       {"libcurl", [&] { return Curl().mail(path, url); }}}};
   row.clock = true;
   runner.measure(row);
 }
@@ -200,6 +251,7 @@ void measure(Runner& runner) {
     // Without root there is no FTP server.
     if (!told("FTP_PORT").empty())
       measure_ways(runner, "FTP", ftp, told("FTP_HOME") + "/pub/bench", files);
+    measure_encrypted(runner, files);
   }
   measure_mail(runner);
 }

@@ -1,35 +1,30 @@
 // Moves a folder, and finds documents in it by the paths that they had before.
 #include <cstdio>
-#include <filesystem>
+#include <optional>
 #include <string>
 
-#include <zarvo.h>
+#include <zarvo.hpp>
 
 namespace {
 
-// A path as somebody wrote it, in the form that the path map compares; empty when it leads nowhere.
-std::string canonical(const char* written) {
-  char path[ZV_PATH_MAX];
-  if (zv_strncpy(path, written, sizeof path) == sizeof path - 1) return "";  // perhaps cut
-  if (zv_normalize_path(path) == 0) return "";
-  if (zv_ispath_relative(path) && !zv_absolute(path, nullptr, path, sizeof path)) return "";
-  return path;
+// A path as somebody wrote it, in the form that the path map compares.
+std::optional<std::string> canonical(const char* written) {
+  const auto path = zarvo::normalize_path(written);
+  return path && zv_ispath_relative(path->c_str()) ? zarvo::absolute(*path) : path;
 }
 
-bool move_folder(const std::string& from, const std::string& to) {
-  std::error_code error;
-  if (from.empty() || to.empty()) return false;
-  std::filesystem::rename(from, to, error);
+bool move_folder(const std::optional<std::string>& from, const std::optional<std::string>& to) {
+  if (!from || from->empty() || !to || to->empty()) return false;
+  if (std::rename(from->c_str(), to->c_str()) != 0) return false;
   // The path map goes by the folders that files lie in: any name stands for all of them.
-  return !error && zv_pathmap((from + "/any").c_str(), (to + "/any").c_str()) != 0;
+  return zv_pathmap((*from + "/any").c_str(), (*to + "/any").c_str()) != 0;
 }
 
 bool print_place(const char* document) {
-  char path[ZV_PATH_MAX];
-  zv_strncpy(path, canonical(document).c_str(), sizeof path);
-  const bool found = zv_pathmap_locate(path) != 0;
-  std::printf("%s: %s\n", document, found ? path : "not found");
-  return found;
+  auto place = canonical(document);
+  if (place) place = zarvo::pathmap_locate(*place);
+  std::printf("%s: %s\n", document, place.value_or("not found").c_str());
+  return place.has_value();
 }
 
 }  // namespace

@@ -1,32 +1,28 @@
 // Writes a report, mails it as an attachment and leaves nothing of it on the disk.
 #include <cstdio>
+#include <optional>
+#include <string>
 
-#include <zarvo.h>
+#include <zarvo.hpp>
 
 namespace {
 
 // A folder that was not there before, so that nobody has prepared what will lie in it.
-bool make_folder(char* folder) {
-  char temporary[ZV_PATH_MAX];
-  if (zv_tempdir(temporary, sizeof temporary) == 0) return false;
-  for (int i = 0; i < 100; ++i) {
-    const int length = std::snprintf(folder, ZV_PATH_MAX, "%s/report-%d", temporary, i);
-    if (length < ZV_PATH_MAX && zv_mkdir(folder) == 0) return true;
+std::optional<std::string> make_folder() {
+  const auto temporary = zarvo::tempdir();
+  for (int i = 0; temporary && i < 100; ++i) {
+    auto folder = zarvo::absolute("report-" + std::to_string(i), *temporary);
+    if (folder && zv_mkdir(folder->c_str()) == 0) return folder;
   }
-  return false;
+  return std::nullopt;
 }
 
-bool write_report(const char* path) {
-  char user[64];
-  char host[64];
-  zv_username(user, sizeof user);
-  zv_hostname(host, sizeof host);
-  FILE* const file = zv_fopen(path, "w", nullptr);
-  if (file == nullptr) return false;
-  std::fprintf(file, "All is well on %s, says %s.\n", host, user);
-  const bool written = std::fflush(file) == 0 && std::ferror(file) == 0;
-  zv_fclose(file);
-  return written;
+bool write_report(const std::string& path) {
+  zarvo::Stream file(path, "w");
+  const auto host = zarvo::hostname().value_or("this machine");
+  const auto user = zarvo::username().value_or("nobody");
+  return file && file.write_text("All is well on " + host + ", says " + user + ".\n") &&
+         std::fflush(file.get()) == 0;
 }
 
 }  // namespace
@@ -36,17 +32,18 @@ int main(int argc, char** argv) {
     std::fprintf(stderr, "usage: report smtp://[SENDER[:PASSWORD]@]SERVER[:PORT]/RECIPIENT\n");
     return 2;
   }
-  char folder[ZV_PATH_MAX];
-  char report[ZV_PATH_MAX];  // the attachment has this file's name
-  if (!make_folder(folder)) {
+  const auto folder = make_folder();
+  if (!folder) {
     std::fprintf(stderr, "report: no folder can be made in the temporary folder\n");
     return 1;
   }
-  int result = ZV_COPY_SOURCE_FAILED;
-  if (zv_absolute("report.txt", folder, report, sizeof report) && write_report(report))
-    result = zv_copy(report, argv[1]);
-  zv_rmpath(folder);
-  if (result == ZV_COPY_SOURCE_FAILED) std::fprintf(stderr, "report: cannot be written\n");
-  if (result == ZV_COPY_DESTINATION_FAILED) std::fprintf(stderr, "report: cannot be mailed\n");
-  return result == 0 ? 0 : 1;
+  auto result = zarvo::Copied::source_failed;
+  const auto report =
+      zarvo::absolute("report.txt", *folder);  // the attachment has this file's name
+  if (report && write_report(*report)) result = zarvo::copy(*report, argv[1]);
+  zv_rmpath(folder->c_str());
+  if (result == zarvo::Copied::source_failed) std::fprintf(stderr, "report: cannot be written\n");
+  if (result == zarvo::Copied::destination_failed)
+    std::fprintf(stderr, "report: cannot be mailed\n");
+  return result == zarvo::Copied::whole ? 0 : 1;
 }

@@ -1,25 +1,32 @@
-// Fetches a file, and tries again when the network fails for a moment; what was there before stays
-// until all of the new file is.
+// Fetches a file within limits, shows how far it is, and tries again after a failure of the moment.
+// What was there before stays until all of the new file is.
 #include <chrono>
 #include <cstdio>
-#include <filesystem>
-#include <string>
 #include <thread>
 
-#include <zarvo.h>
+#include <zarvo.hpp>
 
 namespace {
 
-// Only a source is tried again: nobody knows what a destination that failed has taken already.
-int copy_with_retries(const char* from, const char* to, int tries) {
-  std::chrono::milliseconds pause(200);
-  int result = zv_copy(from, to);
-  for (; result == ZV_COPY_SOURCE_FAILED && --tries > 0; pause *= 2) {
-    std::fprintf(stderr, "retry: failed, %d more\n", tries);
-    std::this_thread::sleep_for(pause);
-    result = zv_copy(from, to);
+// Called a few times a second, and once more at the end.
+constexpr auto show_progress = [](std::int64_t done, std::int64_t total) {
+  const double share = total > 0 ? static_cast<double>(done) / static_cast<double>(total) : 0;
+  if (total > 0) std::fprintf(stderr, "\r%3.0f %%%s", 100 * share, done == total ? "\n" : "");
+  return true;  // go on; false would cancel
+};
+
+// Whether the same may go well in a moment.
+bool is_of_the_moment(int cause) {
+  switch (cause) {
+    case ZV_CAUSE_LOOKUP:
+    case ZV_CAUSE_CONNECT:
+    case ZV_CAUSE_SILENCE:
+    case ZV_CAUSE_CLOSED:
+    case ZV_CAUSE_REFUSED_NOW:
+      return true;
+    default:
+      return false;
   }
-  return result;
 }
 
 }  // namespace
@@ -29,17 +36,17 @@ int main(int argc, char** argv) {
     std::fprintf(stderr, "usage: retry LOCATION FILE\n");
     return 2;
   }
-  const std::string part = std::string(argv[2]) + ".part";
-  const int result = copy_with_retries(argv[1], part.c_str(), 3);
-  std::error_code error;
-  if (result == 0) std::filesystem::rename(part, argv[2], error);
-  if (result == 0 && !error) return 0;
+  zarvo::Transfer transfer;
+  if (!transfer) return 1;
+  zv_transfer_set(transfer.get(), ZV_TRANSFER_SILENCE, 10000);   // milliseconds
+  zv_transfer_set(transfer.get(), ZV_TRANSFER_SIZE, 100000000);  // bytes
+  transfer.watch(show_progress);
 
-  // The location is not printed: a password may stand in it.
-  if (result == ZV_COPY_SOURCE_FAILED)
-    std::fprintf(stderr, "retry: the source could not be read\n");
-  else
-    std::fprintf(stderr, "retry: %s could not be written\n", argv[2]);
-  std::filesystem::remove(part, error);
-  return 1;
+  std::chrono::milliseconds pause(200);
+  for (int more = 2; transfer.run(argv[1], argv[2]) != zarvo::Copied::whole; --more, pause *= 2) {
+    std::fprintf(stderr, "retry: %s\n", transfer.reason().c_str());
+    if (more == 0 || !is_of_the_moment(zv_transfer_cause(transfer.get(), nullptr))) return 1;
+    std::this_thread::sleep_for(pause);
+  }
+  return 0;
 }

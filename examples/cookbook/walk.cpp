@@ -2,35 +2,8 @@
 #include <algorithm>
 #include <cstdio>
 #include <cstdlib>
-#include <memory>
 
-#include <zarvo.h>
-
-namespace {
-
-struct FreeList {
-  void operator()(char** list) const { zv_strlist_free(list, -1); }
-};
-
-struct Wanted {
-  dirsel_t names;
-  long long smallest;
-  long long total;
-};
-
-// Called by the library for each entry, so nothing may be thrown here.
-int is_wanted(const char* folder, const char* name, void* user) {
-  auto& wanted = *static_cast<Wanted*>(user);
-  char path[ZV_PATH_MAX];
-  struct _stat64 status;
-  if (zv_dir_select(folder, name, &wanted.names) == 0) return 0;
-  if (zv_absolute(name, folder, path, sizeof path) == 0 || zv_stat(path, &status) != 0) return 0;
-  if (status.st_size < wanted.smallest) return 0;
-  wanted.total += status.st_size;
-  return 1;
-}
-
-}  // namespace
+#include <zarvo.hpp>
 
 int main(int argc, char** argv) {
   if (argc != 4) {
@@ -41,15 +14,23 @@ int main(int argc, char** argv) {
     std::fprintf(stderr, "walk: cannot read %s\n", argv[1]);
     return 1;
   }
-  Wanted wanted = {{nullptr, argv[2], ";", 0, 0}, std::atoll(argv[3]), 0};
-  char** list = nullptr;
-  const int count = zv_dir_scan(argv[1], &list, is_wanted, &wanted, 1, 1);
-  const std::unique_ptr<char*[], FreeList> owner(list);
-  if (count < 0) {
+  const dirsel_t names = {nullptr, argv[2], ";", 0, 0};
+  const long long smallest = std::atoll(argv[3]);
+  long long total = 0;
+  const auto is_wanted = [&](const char* folder, const char* name) {
+    struct _stat64 status;
+    if (zv_dir_select(folder, name, &names) == 0) return false;
+    const auto path = zarvo::absolute(name, folder);
+    if (!path || zv_stat(path->c_str(), &status) != 0 || status.st_size < smallest) return false;
+    total += status.st_size;
+    return true;
+  };
+  const auto list = zarvo::dir_scan(argv[1], zarvo::Listed::tree, is_wanted);
+  if (!list) {
     std::fprintf(stderr, "walk: cannot examine all of %s\n", argv[1]);
     return 1;
   }
-  std::sort(list, list + count, [](auto a, auto b) { return zv_stricmp(a, b) < 0; });
-  for (int i = 0; i < count; ++i) std::puts(list[i]);
-  std::printf("%d files, %lld bytes\n", count, wanted.total);
+  std::sort(list.begin(), list.end(), [](auto a, auto b) { return zv_stricmp(a, b) < 0; });
+  for (const char* path : list) std::puts(path);
+  std::printf("%zu files, %lld bytes\n", list.size(), total);
 }

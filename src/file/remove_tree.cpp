@@ -3,7 +3,9 @@
 #include <algorithm>
 
 #include "file/scan.h"
+#include "frame/text_view.h"
 #include "path/form.h"
+#include "path/pieces.h"
 #include "platform/platform.h"
 #include "strlist/list_owner.h"
 #include "zarvo.h"
@@ -18,7 +20,7 @@ class FolderChain {
   explicit FolderChain(const zv::PathBuffer& top) {
     const intptr_t folder = platform::folder_open(top.c_str());
     if (folder == platform::no_folder || !path_.append(top.view())) return;
-    if (path_.back() == '/' || path_.append('/')) push(folder);
+    if (zv::end_with_slash(path_)) push(folder);
   }
   ~FolderChain() {
     while (open()) pop();
@@ -79,6 +81,16 @@ class FolderChain {
   zv::TextBuffer<ZV_PATH_MAX + 1> path_;
 };
 
+// A root or a drive is never removed, nor what "." or ".." stands for: of a path that ends in one,
+// nothing would be left to remove it from.
+bool may_be_removed(const zv::PathBuffer& path) {
+  std::string_view text = path.view();
+  if (zv::is_root(text)) return false;
+  if (zv::is_dos(text)) text.remove_prefix(2);
+  const std::string_view name = zv::last_component(text);
+  return !name.empty() && !zv::is_dot_or_dots(name);
+}
+
 bool remove_content(const zv::PathBuffer& top) {
   FolderChain folders(top);
   zv::ListOwner entries;
@@ -90,11 +102,12 @@ bool remove_content(const zv::PathBuffer& top) {
 
 }  // namespace
 
+// A path that was cut would name another tree, and a separator at the end would lead through a
+// link. Only what was found to be a folder in the caller's own text is removed: `X:` is one in
+// another place than `X:/`.
 int zv_rmpath(const char* path) {
-  zv::PathBuffer room;
   zv::PathBuffer top;
-  const char* const native = platform::native_path(path, room);
-  // A path that was cut would name another tree. A separator at the end would lead through a link.
-  if (native == nullptr || !top.assign_cut(native) || !zv::trim_slash(top)) return 0;
+  if (!platform::slashed_path(path, top) || !zv::trim_slash(top)) return 0;
+  if (!may_be_removed(top) || platform::lies_at(top.c_str()) != platform::Kind::folder) return 0;
   return remove_content(top) && platform::remove_folder(top.c_str());
 }

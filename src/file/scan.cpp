@@ -2,20 +2,15 @@
 // buffer. The kind of an entry comes from its search, so that no entry costs a call of its own.
 #include "file/scan.h"
 
-#include <cstring>
-
 #include "file/search.h"
 #include "file/select.h"
+#include "frame/text_view.h"
 
 namespace zv {
 
 namespace {
 
-using platform::EntryKind;
-
-bool is_dot_or_dots(const char* name) {
-  return std::strcmp(name, ".") == 0 || std::strcmp(name, "..") == 0;
-}
+using platform::Kind;
 
 class Scan {
  public:
@@ -32,29 +27,29 @@ class Scan {
  private:
   // All entries of the folder whose path stands in path_.
   bool folder(const char* dir, Search& search) {
-    const bool has_room = path_.empty() || path_.back() == '/' || path_.append('/');
+    const bool has_room = end_with_slash(path_);
     const size_t prefix = path_.size();
     do {
       const char* const name = search.entry().name;
       if (is_dot_or_dots(name)) continue;
       path_.shorten(prefix);
       if (full_path_ && !(has_room && path_.append(name))) return false;
-      if (wanted(dir, search.entry()) && !list_.append(full_path_ ? path_.view() : name))
-        return false;
+      if (wanted(dir, search) && !list_.append(full_path_ ? path_.view() : name)) return false;
       if (options_.recursive && !descend(search)) return false;
     } while (search.next());
     return true;
   }
 
-  bool wanted(const char* dir, const platform::Entry& entry) const {
+  bool wanted(const char* dir, Search& search) const {
+    const platform::Entry& entry = search.entry();
     if (options_.filter != nullptr) return options_.filter(dir, entry.name, options_.user) != 0;
-    return options_.selection == nullptr || selects(*options_.selection, dir, entry);
+    return options_.selection == nullptr || selects(*options_.selection, dir, entry, &search);
   }
 
   bool descend(const Search& parent) {
-    EntryKind kind = parent.entry().kind;
-    if (kind == EntryKind::unknown) kind = platform::entry_kind(path_.c_str());
-    if (kind != EntryKind::directory) return kind != EntryKind::unknown;
+    Kind kind = parent.entry().kind;
+    if (kind == Kind::none) kind = platform::entry_kind(path_.c_str());
+    if (kind != Kind::folder) return kind != Kind::none;
 
     const size_t outer = folder_.size();
     folder_ = path_;

@@ -27,9 +27,20 @@ class Search {
   const platform::Entry& entry() const { return entry_; }
   bool next() { return platform::search_next(handle_, entry_); }
 
+  // Whether the entry is hidden. Where no attributes are kept, that is found out once; a folder or
+  // a link may lead to where they are.
+  bool hidden(const char* path) {
+    if (entry_.hidden != platform::Hidden::unknown) return entry_.hidden == platform::Hidden::yes;
+    if (none_hidden_ && entry_.kind == platform::Kind::other) return false;
+    const platform::Hidden hidden = platform::entry_hidden(handle_, entry_.name, path);
+    none_hidden_ = hidden == platform::Hidden::never;
+    return hidden == platform::Hidden::yes;
+  }
+
  private:
   platform::Entry entry_ = {};
   intptr_t handle_;
+  bool none_hidden_ = false;
 };
 
 }  // namespace zv

@@ -7,13 +7,9 @@
 #include <cstring>
 
 namespace platform = zv::platform;
-using platform::EntryKind;
-using platform::Hidden;
+using platform::Kind;
 
 namespace {
-
-constexpr unsigned kind_mask = 0xF000;
-constexpr unsigned directory_kind = 0x4000;
 
 // One name, compared with one pattern after another.
 class Matcher {
@@ -66,42 +62,31 @@ class Matcher {
   zv::PathBuffer lowered_;
 };
 
-[[nodiscard]] bool join(zv::PathBuffer& path, const char* dir, const char* name) {
-  return path.append(dir) && (path.empty() || path.back() == '/' || path.append('/')) &&
-         path.append(name);
-}
-
-// What the entry is behind its links; unknown when it is gone.
-EntryKind kind_behind(const char* path, EntryKind kind) {
-  if (kind == EntryKind::directory || kind == EntryKind::other) return kind;
-  struct _stat64 st;
-  if (platform::status(path, &st) != 0) return EntryKind::unknown;
-  return (st.st_mode & kind_mask) == directory_kind ? EntryKind::directory : EntryKind::other;
-}
-
-bool is_hidden(const char* path, Hidden hidden) {
-  return hidden == Hidden::unknown ? platform::is_hidden(path) : hidden == Hidden::yes;
+// What the entry leads to; none when it is gone.
+Kind target_kind(const char* path, Kind kind) {
+  return kind == Kind::folder || kind == Kind::other ? kind : platform::lies_at(path);
 }
 
 }  // namespace
 
-bool zv::selects(const dirsel_t& sel, const char* dir, const platform::Entry& entry) {
+bool zv::selects(const dirsel_t& sel, const char* dir, const platform::Entry& entry,
+                 Search* search) {
   const Matcher matcher(entry.name, sel.match_case != 0);
   const bool as_directory =
-      entry.kind != EntryKind::other && matcher.matches_one_of(sel.dir_patterns, sel.separators);
-  const bool as_file = entry.kind != EntryKind::directory &&
-                       matcher.matches_one_of(sel.file_patterns, sel.separators);
+      entry.kind != Kind::other && matcher.matches_one_of(sel.dir_patterns, sel.separators);
+  const bool as_file =
+      entry.kind != Kind::folder && matcher.matches_one_of(sel.file_patterns, sel.separators);
   if (!as_directory && !as_file) return false;
 
   zv::PathBuffer path;
-  if (!join(path, dir, entry.name)) return false;
-  const EntryKind kind = kind_behind(path.c_str(), entry.kind);
-  if (kind == EntryKind::unknown || !(kind == EntryKind::directory ? as_directory : as_file))
-    return false;
-  return sel.show_hidden != 0 || !is_hidden(path.c_str(), entry.hidden);
+  if (!path.append(dir) || !append_name(path, entry.name)) return false;
+  const Kind kind = target_kind(path.c_str(), entry.kind);
+  if (kind == Kind::none || !(kind == Kind::folder ? as_directory : as_file)) return false;
+  if (sel.show_hidden != 0) return true;
+  return !(search != nullptr ? search->hidden(path.c_str()) : platform::is_hidden(path.c_str()));
 }
 
 int zv_dir_select(const char* dir, const char* name, const dirsel_t* sel) {
   if (name == nullptr || *name == '\0') return 0;
-  return sel == nullptr || zv::selects(*sel, dir, {name, EntryKind::unknown});
+  return sel == nullptr || zv::selects(*sel, dir, {name, Kind::none}, nullptr);
 }

@@ -2,13 +2,15 @@
 #ifndef ZARVO_FILE_SELECT_H
 #define ZARVO_FILE_SELECT_H
 
+#include "file/search.h"
 #include "platform/platform.h"
 #include "zarvo.h"
 
 namespace zv {
 
-// zv_dir_select() for a name that is not empty. What its search told of the entry needs no call.
-bool selects(const dirsel_t& sel, const char* dir, const platform::Entry& entry);
+// zv_dir_select() for a name that is not empty: an entry on which a search stands, or one that a
+// caller names, without a search.
+bool selects(const dirsel_t& sel, const char* dir, const platform::Entry& entry, Search* search);
 
 }  // namespace zv
 

@@ -7,6 +7,7 @@
 #include <cstring>
 #include <string_view>
 
+#include "frame/text_view.h"
 #include "zarvo.h"
 
 namespace zv {
@@ -36,15 +37,14 @@ class TextBuffer {
   // Keeps what fits, as zv_strncpy() does; tells whether all of it did. Reads no more of the text
   // than can be kept.
   bool assign_cut(const char* text) {
-    const void* const end = std::memchr(text, '\0', Size);
-    set(text,
-        end != nullptr ? static_cast<size_t>(static_cast<const char*>(end) - text) : capacity);
-    return end != nullptr;
+    const std::string_view read = bounded(text, Size);
+    set(read.data(), read.size());
+    return read.size() <= capacity;
   }
 
   [[nodiscard]] bool append(std::string_view text) {
     if (text.size() > capacity - size_) return false;
-    std::memmove(text_ + size_, text.data(), text.size());
+    if (!text.empty()) std::memmove(text_ + size_, text.data(), text.size());
     measure(size_ + text.size());
     return true;
   }
@@ -70,10 +70,9 @@ class TextBuffer {
   template <class Write>
   [[nodiscard]] bool fill(Write write) {
     text_[0] = '\0';
-    const bool written = write(text_, Size);
-    const void* const end = written ? std::memchr(text_, '\0', Size) : nullptr;
-    measure(end != nullptr ? static_cast<size_t>(static_cast<const char*>(end) - text_) : 0);
-    return end != nullptr;
+    const size_t written = write(text_, Size) ? bounded(text_, Size).size() : Size;
+    measure(written <= capacity ? written : 0);
+    return written <= capacity;
   }
 
   // Lets an in-place edit that never makes the text longer work on it, then measures it anew.
@@ -85,7 +84,7 @@ class TextBuffer {
 
  private:
   void set(const char* text, size_t size) {
-    std::memmove(text_, text, size);
+    if (size != 0) std::memmove(text_, text, size);  // it takes no nullptr
     measure(size);
   }
 
@@ -99,6 +98,18 @@ class TextBuffer {
 };
 
 using PathBuffer = TextBuffer<ZV_PATH_MAX>;
+
+// Ends a folder with its separator; an empty one, which is the current folder, has none.
+template <size_t Size>
+[[nodiscard]] bool end_with_slash(TextBuffer<Size>& folder) {
+  return folder.empty() || folder.back() == '/' || folder.append('/');
+}
+
+// Appends a name in a folder. False when it does not fit.
+template <size_t Size>
+[[nodiscard]] bool append_name(TextBuffer<Size>& folder, std::string_view name) {
+  return end_with_slash(folder) && folder.append(name);
+}
 
 }  // namespace zv
 

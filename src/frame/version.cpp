@@ -4,6 +4,7 @@
 #include <cstring>
 
 #include "frame/text_buffer.h"
+#include "frame/text_view.h"
 #include "zarvo.h"
 
 namespace {
@@ -52,7 +53,7 @@ int zv_split_version(const char* version, int* major, int* minor, int* patch, ch
   if (text.empty()) return 0;
 
   const char last = text.back();
-  if (release != nullptr) zv_strncpy(release, release_name(last), release_size);
+  if (release != nullptr) zv::put(release_name(last), release, release_size);
   if (std::isalpha(static_cast<unsigned char>(last)) != 0) text.shorten(text.size() - 1);
 
   const char* field = text.c_str();

@@ -6,6 +6,7 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "frame/lock.h"
 #include "host/variable_table.h"
 #include "zarvo.h"
 

@@ -1,55 +1,39 @@
-// A hash index over a list: the list keeps the order, the index finds.
+// A hash table with a chain a bucket. A variable is one block: its record, its name, its values.
 #include "host/variable_table.h"
 
 #include <algorithm>
-#include <cctype>
-#include <cstdint>
 #include <cstdlib>
 #include <cstring>
-#include <memory>
+#include <utility>
+
+#include "frame/byte_map.h"
+#include "platform/platform.h"
+#include "strings/hash.h"
 
 namespace zv {
 
-// The name, in the spelling it was made with, lies behind the record in the same block.
 struct Variable {
-  size_t hash;
-  Variable* next_in_bucket;
-  Variable* older;
-  Variable* newer;
-  char* values;
+  Variable* next;  // in its bucket
+  uint64_t hash;
+  size_t name_size;
   size_t values_size;
   size_t values_room;
-  size_t name_size;
 
-  char* name_room() { return reinterpret_cast<char*>(this + 1); }
   std::string_view name() const { return {reinterpret_cast<const char*>(this + 1), name_size}; }
+  // Each ended by a NUL.
+  char* values() { return reinterpret_cast<char*>(this + 1) + name_size; }
+  std::string_view all_values() { return {values(), values_size}; }
 };
 
 namespace {
 
-struct FreeVariable {
-  void operator()(Variable* variable) const {
-    std::free(variable->values);
-    std::free(variable);
-  }
-};
-
-using VariablePtr = std::unique_ptr<Variable, FreeVariable>;
-
-// Room doubles, so that many appends do not copy the values each time.
-bool add_value(Variable& variable, std::string_view value) {
-  const size_t needed = variable.values_size + value.size() + 1;
-  if (needed > variable.values_room) {
-    const size_t room = std::max(needed, 2 * variable.values_room);
-    void* const moved = std::realloc(variable.values, room);
-    if (moved == nullptr) return false;
-    variable.values = static_cast<char*>(moved);
-    variable.values_room = room;
-  }
-  std::memcpy(variable.values + variable.values_size, value.data(), value.size());
-  variable.values[needed - 1] = '\0';
-  variable.values_size = needed;
-  return true;
+// A to Z among the eight characters of a word made lower-case.
+uint64_t lower_ascii(uint64_t word) {
+  constexpr uint64_t each = 0x0101010101010101U;
+  const uint64_t low = word & 0x7F * each;
+  const uint64_t from_a = low + (0x80 - 'A') * each;
+  const uint64_t above_z = low + (0x7F - 'Z') * each;
+  return word | (from_a & ~above_z & ~word & 0x80 * each) >> 2;
 }
 
 bool holds(std::string_view values, std::string_view value) {
@@ -61,113 +45,140 @@ bool holds(std::string_view values, std::string_view value) {
   return false;
 }
 
-VariablePtr make_variable(std::string_view name, std::string_view value) {
-  VariablePtr made(static_cast<Variable*>(std::calloc(1, sizeof(Variable) + name.size())));
-  if (made == nullptr || !add_value(*made, value)) return nullptr;
-  std::memcpy(made->name_room(), name.data(), name.size());
-  made->name_size = name.size();
-  return made;
+// Moves the variable that `place` leads to into a block of more room.
+bool enlarge(Variable** place, size_t name_size, size_t values_room) {
+  void* const block = std::realloc(*place, sizeof(Variable) + name_size + values_room);
+  if (block == nullptr) return false;
+  *place = static_cast<Variable*>(block);
+  (*place)->values_room = values_room;
+  return true;
+}
+
+// Room doubles, so that many appends do not copy the values each time.
+bool add_value(Variable** place, std::string_view value) {
+  const size_t size = (*place)->values_size;
+  const size_t needed = size + value.size() + 1;
+  if (needed > (*place)->values_room &&
+      !enlarge(place, (*place)->name_size, std::max(needed, 2 * size)))
+    return false;
+  char* const end = (*place)->values() + size;
+  std::memcpy(end, value.data(), value.size());
+  end[value.size()] = '\0';
+  (*place)->values_size = needed;
+  return true;
+}
+
+void remove_at(Variable** place) {
+  Variable* const variable = *place;
+  *place = variable->next;
+  std::free(variable);
 }
 
 }  // namespace
 
 std::string_view VariableTable::values(std::string_view name) const {
-  const Variable* const found = find(name);
-  if (found == nullptr) return {};
-  return {found->values, found->values_size};
+  Variable** const found = find(name);
+  return found != nullptr ? (*found)->all_values() : std::string_view();
 }
 
 bool VariableTable::set(std::string_view name, std::string_view value) {
-  remove(name);
-  if (!make_room()) return false;
-  VariablePtr made = make_variable(name, value);
-  if (made == nullptr) return false;
-  link(made.release());
-  return true;
+  Variable** const found = find(name);
+  if (found == nullptr) return make(name, value);
+  (*found)->values_size = 0;
+  if (add_value(found, value)) return true;
+  remove_at(found);
+  --count_;
+  return false;
 }
 
 bool VariableTable::append(std::string_view name, std::string_view value) {
-  Variable* const found = find(name);
-  if (found == nullptr) return set(name, value);
-  return holds({found->values, found->values_size}, value) || add_value(*found, value);
+  Variable** const found = find(name);
+  if (found == nullptr) return make(name, value);
+  return holds((*found)->all_values(), value) || add_value(found, value);
 }
 
 void VariableTable::remove(std::string_view name) {
-  Variable* const found = find(name);
+  Variable** const found = find(name);
   if (found == nullptr) return;
-  unlink(found);
-  FreeVariable()(found);
+  remove_at(found);
+  --count_;
 }
 
 void VariableTable::clear() {
-  while (oldest_ != nullptr) {
-    const VariablePtr variable(oldest_);
-    oldest_ = variable->newer;
-  }
+  for (size_t i = 0; i < bucket_count_; ++i)
+    while (buckets_[i] != nullptr) remove_at(&buckets_[i]);
   std::free(buckets_);
   *this = VariableTable();
 }
 
-// FNV-1a over the folded name.
-size_t VariableTable::hash_of(std::string_view name) const {
-  uint64_t hash = 0xcbf29ce484222325U;
-  for (const char ch : name) hash = (hash ^ folded(ch)) * 0x100000001b3U;
-  return hash;
+void VariableTable::note_case() {
+  ByteMap room;
+  const int32_t* const lower = platform::lower_map(room);
+  std::copy(lower, lower + room.size(), fold_.begin());
+  only_ascii_has_case_ = agrees(lower, ascii_lower);
+}
+
+// Each of the eight characters in lower case.
+uint64_t VariableTable::folded(uint64_t word) const {
+  if (only_ascii_has_case_) return lower_ascii(word);
+  uint64_t lowered = 0;
+  for (int shift = 0; shift < 64; shift += 8)
+    lowered |= static_cast<uint64_t>(fold_[word >> shift & 0xFF]) << shift;
+  return lowered;
 }
 
 bool VariableTable::is_name_of(const Variable& variable, std::string_view name) const {
-  const std::string_view own = variable.name();
-  return std::equal(own.begin(), own.end(), name.begin(), name.end(),
-                    [this](char a, char b) { return folded(a) == folded(b); });
+  std::string_view own = variable.name();
+  if (own.size() != name.size()) return false;
+  for (; name.size() > 8; name.remove_prefix(8), own.remove_prefix(8))
+    if (folded(load_word<uint64_t>(name.data())) != folded(load_word<uint64_t>(own.data())))
+      return false;
+  return folded(load_short(name)) == folded(load_short(own));
 }
 
-Variable* VariableTable::find(std::string_view name) const {
+// The link that leads to the variable; nullptr where there is none.
+Variable** VariableTable::find(std::string_view name) const {
   if (count_ == 0) return nullptr;
-  const size_t hash = hash_of(name);
-  Variable* variable = bucket(hash);
-  while (variable != nullptr && !(variable->hash == hash && is_name_of(*variable, name)))
-    variable = variable->next_in_bucket;
-  return variable;
+  const uint64_t hash = hash_of(name, key_, [this](uint64_t word) { return folded(word); });
+  for (Variable** place = &bucket(hash); *place != nullptr; place = &(*place)->next)
+    if ((*place)->hash == hash && is_name_of(**place, name)) return place;
+  return nullptr;
 }
 
 // One bucket a variable. Where memory for more buckets is short, the ones there are go on serving.
 bool VariableTable::make_room() {
   if (count_ < bucket_count_) return true;
   const size_t wanted = std::max<size_t>(16, 2 * bucket_count_);
-  void* const made = std::calloc(wanted, sizeof(Variable*));
+  auto** const made = static_cast<Variable**>(std::calloc(wanted, sizeof(Variable*)));
   if (made == nullptr) return bucket_count_ != 0;
-  if (bucket_count_ == 0) note_case();
-  std::free(buckets_);
-  buckets_ = static_cast<Variable**>(made);
-  bucket_count_ = wanted;
-  for (Variable* variable = oldest_; variable != nullptr; variable = variable->newer) {
-    variable->next_in_bucket = bucket(variable->hash);
-    bucket(variable->hash) = variable;
+  if (bucket_count_ == 0) {
+    note_case();
+    key_ = hash_key();
   }
+  for (size_t i = 0; i < bucket_count_; ++i) {
+    while (Variable* const variable = buckets_[i]) {
+      buckets_[i] = variable->next;
+      variable->next = std::exchange(made[variable->hash & (wanted - 1)], variable);
+    }
+  }
+  std::free(buckets_);
+  buckets_ = made;
+  bucket_count_ = wanted;
   return true;
 }
 
-void VariableTable::note_case() {
-  for (int ch = 0; ch < 256; ++ch) fold_[ch] = static_cast<unsigned char>(std::tolower(ch));
-}
-
-void VariableTable::link(Variable* variable) {
-  variable->hash = hash_of(variable->name());
-  variable->next_in_bucket = bucket(variable->hash);
-  bucket(variable->hash) = variable;
-  variable->older = newest_;
-  (newest_ != nullptr ? newest_->newer : oldest_) = variable;
-  newest_ = variable;
+bool VariableTable::make(std::string_view name, std::string_view value) {
+  Variable* made = nullptr;
+  if (!make_room() || !enlarge(&made, name.size(), value.size() + 1)) return false;
+  const uint64_t hash = hash_of(name, key_, [this](uint64_t word) { return folded(word); });
+  made->hash = hash;
+  made->name_size = name.size();
+  made->values_size = 0;
+  std::memcpy(made + 1, name.data(), name.size());
+  static_cast<void>(add_value(&made, value));
+  made->next = std::exchange(bucket(hash), made);
   ++count_;
-}
-
-void VariableTable::unlink(Variable* variable) {
-  Variable** place = &bucket(variable->hash);
-  while (*place != variable) place = &(*place)->next_in_bucket;
-  *place = variable->next_in_bucket;
-  (variable->older != nullptr ? variable->older->newer : oldest_) = variable->newer;
-  (variable->newer != nullptr ? variable->newer->older : newest_) = variable->older;
-  --count_;
+  return true;
 }
 
 }  // namespace zv

@@ -4,13 +4,13 @@
 #include <algorithm>
 
 #include "path/form.h"
-#include "strings/search.h"
+#include "strings/find.h"
 
 namespace zv {
 
 namespace {
 
-// The components behind a root, as far as none is empty: an empty piece ends the list.
+// The components after a root, as far as none is empty: an empty piece ends the list.
 std::string_view up_to_empty_piece(std::string_view path) {
   if (path.starts_with('/')) return {};
   const char* const end = find(path, "//");
@@ -32,6 +32,12 @@ std::string_view Pieces::first_component() const {
   return {below_.data(), std::min(below_.find('/'), below_.size())};
 }
 
+std::string_view Pieces::text() const {
+  if (below_.empty()) return root_;
+  const char* const start = root_.empty() ? below_.data() : root_.data();
+  return {start, below_.data() + below_.size()};
+}
+
 void Pieces::drop_first() {
   if (!root_.empty()) {
     root_ = {};
@@ -51,9 +57,8 @@ void Pieces::drop_last() {
 }
 
 void Pieces::split_share() {
-  const char* const end =
-      below_.empty() ? root_.data() + root_.size() : below_.data() + below_.size();
-  below_ = {root_.data() + 2, end};
+  below_ = text();
+  below_.remove_prefix(2);
   root_ = {};
 }
 
@@ -80,13 +85,11 @@ void Components::drop_dot_pairs() {
 }
 
 bool join(JoinedPath& path, std::string_view component) {
-  if (!path.append(component)) return false;
-  return path.empty() || path.back() == '/' || path.append('/');
+  return path.append(component) && end_with_slash(path);
 }
 
 bool join(JoinedPath& path, const Pieces& pieces) {
-  if (!pieces.root().empty() && !join(path, pieces.root())) return false;
-  return pieces.below().empty() || join(path, pieces.below());
+  return pieces.empty() || join(path, pieces.text());
 }
 
 bool finish(JoinedPath& path) {

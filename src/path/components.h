@@ -17,8 +17,10 @@ class Pieces {
   explicit Pieces(std::string_view path);
 
   bool empty() const { return root_.empty() && below_.empty(); }
-  // A share stands without the separator behind it.
+  // A share stands without the separator after it.
   std::string_view root() const { return root_; }
+  // All of it: a root and its components stand together in the text that was split.
+  std::string_view text() const;
   // The components, with a separator between two.
   std::string_view below() const { return below_; }
   // The root, or where there is none the first component.
@@ -52,7 +54,7 @@ class Components {
   size_t size() const { return size_; }
   std::string_view operator[](size_t i) const { return pieces_[i]; }
 
-  // Cancels each ".." against the component before it, as far as there is one behind the root, and
+  // Cancels each ".." against the component before it, as far as there is one after the root, and
   // drops each "." that a ".." follows.
   void drop_dot_pairs();
 
@@ -66,10 +68,10 @@ class Components {
 };
 
 // A path while it is joined, with room for the separators that are trimmed from its end: the one
-// behind the last component, and that of a root in its place.
+// after the last component, and that of a root in its place.
 using JoinedPath = TextBuffer<ZV_PATH_MAX + 2>;
 
-// Appends a component and the separator behind it. False when they do not fit.
+// Appends a component and the separator after it. False when they do not fit.
 [[nodiscard]] bool join(JoinedPath& path, std::string_view component);
 [[nodiscard]] bool join(JoinedPath& path, const Pieces& pieces);
 

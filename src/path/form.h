@@ -4,18 +4,16 @@
 
 #include <algorithm>
 #include <cstddef>
-#include <cstring>
 #include <string_view>
 
 #include "frame/text_buffer.h"
+#include "frame/text_view.h"
 
 namespace zv {
 
 // The characters of a path that take part: at most 319.
 inline std::string_view path_text(const char* path) {
-  const void* const end = std::memchr(path, '\0', PathBuffer::capacity);
-  return {path, end != nullptr ? static_cast<size_t>(static_cast<const char*>(end) - path)
-                               : PathBuffer::capacity};
+  return bounded(path, PathBuffer::capacity);
 }
 
 // "X:" in front, whatever the character before the colon.
@@ -39,7 +37,7 @@ inline size_t root_size(std::string_view path) {
   return path.starts_with('/') ? 1 : 0;
 }
 
-// "X:/", "/" or "//server/share" with or without one '/' behind it, and nothing more.
+// "X:/", "/" or "//server/share" with or without one '/' after it, and nothing more.
 inline bool is_root(std::string_view path) {
   return !path.empty() && root_size(path) == path.size();
 }

@@ -3,11 +3,11 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "frame/text_view.h"
 #include "path/components.h"
 #include "path/folder.h"
 #include "path/form.h"
-#include "path/output.h"
-#include "path/plain.h"
+#include "path/normalize.h"
 #include "platform/platform.h"
 #include "zarvo.h"
 
@@ -15,18 +15,13 @@ namespace platform = zv::platform;
 
 namespace {
 
-// No locale has white space among the graphic characters of ASCII.
-bool is_space(char ch) {
-  return (ch <= ' ' || ch > '~') && std::isspace(static_cast<unsigned char>(ch)) != 0;
-}
-
 std::string_view without_spaces(std::string_view text) {
-  while (!text.empty() && is_space(text.front())) text.remove_prefix(1);
-  while (!text.empty() && is_space(text.back())) text.remove_suffix(1);
+  while (!text.empty() && zv::is_space(text.front())) text.remove_prefix(1);
+  while (!text.empty() && zv::is_space(text.back())) text.remove_suffix(1);
   return text;
 }
 
-// How much behind a separator adds nothing: more separators, and "." components.
+// How much after a separator adds nothing: more separators, and "." components.
 size_t idle_size(const char* text) {
   size_t size = 0;
   for (;;) {
@@ -37,7 +32,7 @@ size_t idle_size(const char* text) {
   }
 }
 
-// Leaves one separator between components, and no "." behind one.
+// Leaves one separator between components, and no "." after one.
 void squeeze(char* text) {
   char* kept = text;
   while (*text != '\0') {
@@ -64,11 +59,9 @@ int drive_number(char letter) {
 bool complete_from_drive(zv::PathBuffer& path) {
   zv::PathBuffer full;
   if (!platform::drive_directory(drive_number(path[0]), full)) return false;
-  full.replace('\\', '/');
   std::string_view below = zv::without_slashes(path.view());
   below.remove_prefix(2);
-  if (!below.empty() && full.back() != '/' && !full.append('/')) return false;
-  return full.append(below) && path.assign(full.view());
+  return (below.empty() || append_name(full, below)) && path.assign(full.view());
 }
 
 // Where there are drives, "/name" lies on the current one.
@@ -115,8 +108,7 @@ bool join_expanded(const zv::Components& components, zv::JoinedPath& out) {
   for (size_t i = 0; i < components.size(); ++i) {
     std::string_view component = components[i];
     if (i == 0 && component == "~") {
-      if (!room.fill([](char* home, size_t size) { return zv_homedir(home, size) != 0; }))
-        return false;
+      if (!zv::home_folder(room) || !zv::make_usable(room)) return false;
       component = room.view();
     }
     if (take_variable_name(component)) {
@@ -135,8 +127,9 @@ bool climbs_above_root(const zv::Components& components) {
   return components.has_root() && components.size() > 1 && components[1] == "..";
 }
 
-// False with what is to be left in the caller's buffer.
-bool normalize(zv::PathBuffer& text, zv::JoinedPath& out) {
+}  // namespace
+
+bool zv::normalize_fully(PathBuffer& text, JoinedPath& out) {
   text.replace('\\', '/');
   squeeze_path(text);
   if (!expand_drive(text)) return false;
@@ -150,14 +143,12 @@ bool normalize(zv::PathBuffer& text, zv::JoinedPath& out) {
   return false;
 }
 
-}  // namespace
-
 int zv_normalize_path(char* path) {
   zv::PathBuffer text;
   if (!text.assign(without_spaces(zv::path_text(path)))) return 0;  // which always fits
-  if (zv::normalize_plain(text, path)) return 1;
+  if (zv::normalize_fast(text, path)) return 1;
   zv::JoinedPath normal;
-  const bool done = normalize(text, normal);
+  const bool done = zv::normalize_fully(text, normal);
   zv::put(normal.view(), path, ZV_PATH_MAX);
   return done;
 }

@@ -2,15 +2,19 @@
 #include <pthread.h>
 
 #include <algorithm>
+#include <cstdint>
 #include <cstdlib>
 #include <utility>
 
+#include "frame/lock.h"
 #include "frame/owner.h"
 #include "path/components.h"
 #include "path/folder.h"
 #include "path/form.h"
 #include "path/pieces.h"
 #include "path/resolve.h"
+#include "platform/platform.h"
+#include "strings/hash.h"
 #include "zarvo.h"
 
 namespace {
@@ -26,34 +30,56 @@ Text copy_of(const zv::PathBuffer& text) {
 struct Redirect {
   char* from;
   size_t from_size;
+  uint64_t hash;  // of `from`
   char* to;
+  size_t next;  // in its bucket, as there
 };
 
+// A hash index with a chain a bucket finds what the list holds: a place there, counted from 1.
 struct Redirects {
   Redirect* entries;  // oldest first
+  size_t* buckets;    // as many as there is room for entries, a power of 2
   size_t count;
   size_t room;
 
   Redirect* begin() const { return entries; }
   Redirect* end() const { return entries + count; }
+  size_t& bucket(uint64_t hash) const { return buckets[hash & (room - 1)]; }
 };
 
 pthread_mutex_t mutex = PTHREAD_MUTEX_INITIALIZER;
-constinit Redirects redirects = {nullptr, 0, 0};
+constinit Redirects redirects = {nullptr, nullptr, 0, 0};
+
+uint64_t hash_of(std::string_view from) {
+  return zv::hash_of(from, zv::hash_key(), [](uint64_t word) { return word; });
+}
 
 Redirect* find(std::string_view from) {
-  return std::find_if(redirects.begin(), redirects.end(), [from](const Redirect& entry) {
-    return from == std::string_view(entry.from, entry.from_size);
-  });
+  if (redirects.count == 0) return nullptr;
+  const uint64_t hash = hash_of(from);
+  for (size_t place = redirects.bucket(hash); place != 0;) {
+    Redirect& entry = redirects.entries[place - 1];
+    if (entry.hash == hash && from == std::string_view(entry.from, entry.from_size)) return &entry;
+    place = entry.next;
+  }
+  return nullptr;
+}
+
+void link(size_t place) {
+  Redirect& entry = redirects.entries[place - 1];
+  entry.next = std::exchange(redirects.bucket(entry.hash), place);
 }
 
 bool make_room() {
   if (redirects.count < redirects.room) return true;
   const size_t room = std::max<size_t>(8, 2 * redirects.room);
+  zv::HeapPtr<size_t[]> buckets(static_cast<size_t*>(std::calloc(room, sizeof(size_t))));
   void* const moved = std::realloc(redirects.entries, room * sizeof(Redirect));
-  if (moved == nullptr) return false;
-  redirects.entries = static_cast<Redirect*>(moved);
+  if (moved != nullptr) redirects.entries = static_cast<Redirect*>(moved);
+  if (moved == nullptr || buckets == nullptr) return false;
+  std::free(std::exchange(redirects.buckets, buckets.release()));
   redirects.room = room;
+  for (size_t place = 1; place <= redirects.count; ++place) link(place);
   return true;
 }
 
@@ -69,7 +95,9 @@ bool add(const zv::PathBuffer& from, const zv::PathBuffer& to) {
   Text from_copy = copy_of(from);
   Text to_copy = copy_of(to);
   if (from_copy == nullptr || to_copy == nullptr || !make_room()) return false;
-  redirects.entries[redirects.count++] = {from_copy.release(), from.size(), to_copy.release()};
+  redirects.entries[redirects.count++] = {from_copy.release(), from.size(), hash_of(from.view()),
+                                          to_copy.release(), 0};
+  link(redirects.count);
   return true;
 }
 
@@ -89,8 +117,7 @@ bool candidate_for(const Redirect& entry, std::string_view folder, std::string_v
 }
 
 bool exists(const char* path) {
-  struct _stat64 st;
-  return zv_stat(path, &st) == 0;
+  return zv::platform::lies_at(path) != zv::platform::Kind::none;
 }
 
 }  // namespace
@@ -106,7 +133,7 @@ int zv_pathmap(const char* from, const char* to) {
   const zv::LockGuard lock(mutex);
   if (!lock.held()) return 0;
   Redirect* const found = find(from_folder.view());
-  return found != redirects.end() ? change(*found, to_folder) : add(from_folder, to_folder);
+  return found != nullptr ? change(*found, to_folder) : add(from_folder, to_folder);
 }
 
 void zv_pathmap_clear() {
@@ -117,7 +144,8 @@ void zv_pathmap_clear() {
     std::free(entry.to);
   }
   std::free(redirects.entries);
-  redirects = {nullptr, 0, 0};
+  std::free(redirects.buckets);
+  redirects = {nullptr, nullptr, 0, 0};
 }
 
 int zv_pathmap_locate(char* path) {

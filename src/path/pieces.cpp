@@ -4,21 +4,11 @@
 #include <algorithm>
 #include <cstring>
 
+#include "frame/text_view.h"
 #include "path/form.h"
-#include "path/output.h"
 #include "zarvo.h"
 
 namespace {
-
-bool is_dot_or_dots(std::string_view name) {
-  return name.starts_with('.') && (name == "." || name == "..");
-}
-
-std::string_view last_component(std::string_view path) {
-  const size_t slash = path.rfind('/');  // npos + 1 is 0: the whole of it
-  path.remove_prefix(slash + 1);
-  return path;
-}
 
 // The folder of a path: a part of its text, but a bare share in `room`, where it gets the separator
 // of a root if that fits.
@@ -29,8 +19,8 @@ std::string_view folder_text(const char* path, zv::PathBuffer& room) {
     return room.assign(text) && room.append('/') ? room.view() : std::string_view();
   }
   text = zv::without_slashes(text);
-  const std::string_view name = last_component(text);
-  if (is_dot_or_dots(name) || zv::is_root(text)) return text;
+  const std::string_view name = zv::last_component(text);
+  if (zv::is_dot_or_dots(name) || zv::is_root(text)) return text;
   text.remove_suffix(name.size());
   return zv::is_root(text) ? text : zv::without_slashes(text);
 }
@@ -57,11 +47,6 @@ std::string_view file_name(const char* path) {
   if (!is_root(text)) text = without_slashes(text);
   const std::string_view name = last_component(text);
   return is_root(text) || is_dot_or_dots(name) ? std::string_view() : name;
-}
-
-bool append_name(PathBuffer& folder, std::string_view name) {
-  if (!folder.empty() && folder.back() != '/' && !folder.append('/')) return false;
-  return folder.append(name);
 }
 
 }  // namespace zv
@@ -109,13 +94,13 @@ void zv_split_path(char* path) {
 
 int zv_extract_directory(const char* path, char* out, size_t size) {
   zv::PathBuffer room;
-  return zv::put(folder_text(path, room), out, size);
+  return zv::put(folder_text(path, room), out, size) != 0;
 }
 
 int zv_extract_filename(const char* path, char* out, size_t size) {
-  return zv::put(zv::file_name(path), out, size);
+  return zv::put(zv::file_name(path), out, size) != 0;
 }
 
 int zv_extract_extension(const char* path, char* out, size_t size) {
-  return zv::put(extension_of(path), out, size);
+  return zv::put(extension_of(path), out, size) != 0;
 }

@@ -4,9 +4,9 @@
 #include <algorithm>
 #include <cctype>
 
+#include "frame/text_view.h"
 #include "path/folder.h"
 #include "path/form.h"
-#include "path/output.h"
 #include "zarvo.h"
 
 namespace zv {
@@ -76,7 +76,7 @@ int zv_absolute(const char* path, const char* base, char* out, size_t size) {
   zv::Pieces of_base(folder);
   zv::JoinedPath absolute;
   if (of_base.empty() || !zv::resolve(of_path, of_base, absolute)) return 0;
-  return zv::put(absolute.view(), out, size);
+  return zv::put(absolute.view(), out, size) != 0;
 }
 
 int zv_relative(const char* path, const char* base, char* out, size_t size) {

@@ -71,9 +71,9 @@ int zv_path_locate(char* path) {
   std::string_view element;
   while (elements.next(element)) {
     zv::PathBuffer candidate;
-    struct _stat64 st;
-    if (!long_form(element, candidate) || !zv::append_name(candidate, name)) continue;
-    if (zv_stat(candidate.c_str(), &st) != 0) continue;
+    if (!long_form(element, candidate)) continue;
+    if (!name.empty() && !zv::append_name(candidate, name)) continue;
+    if (platform::lies_at(candidate.c_str()) == platform::Kind::none) continue;
     zv_strncpy(path, candidate.c_str(), ZV_PATH_MAX);
     return 1;
   }

@@ -2,8 +2,9 @@
 #include <cstdlib>
 #include <cstring>
 
-#include "plugin/loaded_plugin.h"
+#include "plugin/canonical_path.h"
 #include "plugin/no_library.h"
+#include "plugin/record.h"
 
 namespace {
 
@@ -16,8 +17,8 @@ size_t length(zv_plugin_t** plugins) {
 // The library's folder and file name; false when there is no such file.
 bool locate(const char* path, zv::PathBuffer& folder, zv::PathBuffer& name) {
   zv::PathBuffer file;
-  struct _stat64 st;
-  if (!zv::canonical_path(path, file) || zv_stat(file.c_str(), &st) != 0) return false;
+  if (!zv::canonical_path(path, file)) return false;
+  if (zv::platform::lies_at(file.c_str()) == zv::platform::Kind::none) return false;
   return folder.fill([&file](char* room, size_t size) {
     zv_extract_directory(file.c_str(), room, size);
     return true;
@@ -27,40 +28,44 @@ bool locate(const char* path, zv::PathBuffer& folder, zv::PathBuffer& name) {
   });
 }
 
-int add(zv_plugin_t*** plugins, const char* path, const char* api, int min, int max, int* code,
-        int keep) {
+int add(zv_plugin_t*** plugins, const char* path, const zv::Request& request, int* code,
+        bool keep) {
   *code = ZV_PLUGIN_E_NOT_FOUND;
   zv::PathBuffer folder;
   zv::PathBuffer name;
   if (!locate(path, folder, name)) return 0;
-  const size_t count = length(*plugins);
-  if (count != 0 && zv_plugin_get_entry_by_lib(*plugins, name.c_str()) != nullptr) return 1;
+  if (zv_plugin_get_entry_by_lib(*plugins, name.c_str()) != nullptr) return 1;
 
-  zv_plugin_t* const record = zv_plugin_create(folder.c_str(), name.c_str(), api, min, max, code);
+  zv::RecordPtr record = zv::create_record(folder, name.c_str(), request, code);
   if (record == nullptr) return 0;
-  void* const grown = std::realloc(*plugins, (count + 2) * sizeof(zv_plugin_t*));
+  if (!keep) zv_plugin_unload(record.get());
+  // The plugin ran, and its host may have changed the array meanwhile.
+  const size_t count = length(*plugins);
+  zv_plugin_t** const grown = zv::resize_array(*plugins, count + 1);
   if (grown == nullptr) {
     *code = ZV_PLUGIN_E_MEMORY;
-    zv_plugin_destroy(record);
     return 0;
   }
-  if (keep == 0) zv_plugin_unload(record);
-  *plugins = static_cast<zv_plugin_t**>(grown);
-  (*plugins)[count] = record;
-  (*plugins)[count + 1] = nullptr;
+  grown[count] = record.release();
+  grown[count + 1] = nullptr;
+  *plugins = grown;
   return 1;
 }
 
 }  // namespace
 
+zv_plugin_t** zv::resize_array(zv_plugin_t** array, size_t records) {
+  return static_cast<zv_plugin_t**>(std::realloc(array, (records + 1) * sizeof(zv_plugin_t*)));
+}
+
 int zv_plugin_add_lib(zv_plugin_t*** plugins, const char* path, const char* api, int min, int max,
                       int* code, int keep) {
   int unwanted = 0;
-  return add(plugins, path, api, min, max, code != nullptr ? code : &unwanted, keep);
+  return add(plugins, path, {api, min, max}, code != nullptr ? code : &unwanted, keep != 0);
 }
 
 zv_plugin_t* zv_plugin_get_entry_by_lib(zv_plugin_t** plugins, const char* lib) {
-  if (lib == nullptr || *lib == '\0') return nullptr;
+  if (plugins == nullptr || lib == nullptr || *lib == '\0') return nullptr;
   for (; *plugins != nullptr; ++plugins)
     if (std::strcmp((*plugins)->lib, lib) == 0) return *plugins;
   return nullptr;

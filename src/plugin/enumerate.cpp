@@ -1,25 +1,17 @@
 // All plugins of an API: the folder, its candidates, each tried and reported.
 #include <cstdio>
-#include <cstdlib>
 #include <cstring>
 
 #include "host/environment.h"
-#include "plugin/answer.h"
 #include "plugin/candidates.h"
-#include "plugin/loaded_plugin.h"
+#include "plugin/canonical_path.h"
+#include "plugin/error_text.h"
+#include "plugin/record.h"
 #include "strlist/list_owner.h"
 
 namespace {
 
 using BaseName = zv::TextBuffer<48>;
-
-// What one enumeration asks every plugin for.
-struct Request {
-  const char* folder;
-  const char* api;
-  int min;
-  int max;
-};
 
 bool base_name(const char* api, BaseName& base) {
   return base.assign({api, std::strcspn(api, ".")}) && !base.empty();
@@ -36,9 +28,8 @@ zv::HeapPtr<char> folder_setting(const BaseName& base) {
 
 bool plugin_folder(const BaseName& base, zv::PathBuffer& folder) {
   const zv::HeapPtr<char> setting = folder_setting(base);
-  struct _stat64 st;
   return setting != nullptr && zv::canonical_path(setting.get(), folder) &&
-         zv_stat(folder.c_str(), &st) == 0;
+         zv::platform::lies_at(folder.c_str()) != zv::platform::Kind::none;
 }
 
 // How many files may be plugins of the API, listed in `names`.
@@ -50,7 +41,7 @@ int find_candidates(const zv::PathBuffer& folder, const BaseName& base, char*** 
   return zv_dir_scan(folder.c_str(), names, filter, &selection, 0, 0);
 }
 
-void report_rejection(const Request& request, int code) {
+void report_rejection(const zv::Request& request, int code) {
   std::fputs("\n\trejected: ", stderr);
   if (const char* const text = zv::plugin_error_text(code))
     std::fprintf(stderr, "%s\n", text);
@@ -62,11 +53,11 @@ void report_rejection(const Request& request, int code) {
     std::fprintf(stderr, "error code %d\n", code);
 }
 
-zv_plugin_t* try_candidate(const Request& request, const char* name) {
+zv::RecordPtr try_candidate(const zv::PathBuffer& folder, const char* name,
+                            const zv::Request& request) {
   std::fprintf(stderr, "Testing library %s for %s API...", name, request.api);
   int code = 0;
-  zv_plugin_t* const record =
-      zv_plugin_create(request.folder, name, request.api, request.min, request.max, &code);
+  zv::RecordPtr record = zv::create_record(folder, name, request, &code);
   if (record != nullptr)
     std::fputs("ok\n", stderr);
   else
@@ -75,21 +66,17 @@ zv_plugin_t* try_candidate(const Request& request, const char* name) {
 }
 
 // Tries each name and returns how many were accepted; `array` has room for all of them and a NULL.
-int try_candidates(const Request& request, const zv::ListOwner& names, bool keep,
-                   zv_plugin_t** array) {
+int try_candidates(const zv::PathBuffer& folder, const zv::ListOwner& names,
+                   const zv::Request& request, bool keep, zv_plugin_t** array) {
   int accepted = 0;
   for (const char* const name : names) {
-    zv_plugin_t* const record = try_candidate(request, name);
+    zv::RecordPtr record = try_candidate(folder, name, request);
     if (record == nullptr) continue;
-    if (!keep) zv_plugin_unload(record);
-    array[accepted++] = record;
+    if (!keep) zv_plugin_unload(record.get());
+    array[accepted++] = record.release();
   }
+  array[accepted] = nullptr;
   return accepted;
-}
-
-zv_plugin_t** resize(zv_plugin_t** array, int records) {
-  const size_t slots = static_cast<size_t>(records) + 1;
-  return static_cast<zv_plugin_t**>(std::realloc(array, slots * sizeof(zv_plugin_t*)));
 }
 
 }  // namespace
@@ -104,14 +91,13 @@ int zv_plugin_enumerate(zv_plugin_t*** plugins, const char* api, int min, int ma
   const zv::ListOwner names(list);
   if (found <= 0) return 0;
 
-  zv_plugin_t** array = tried > 0 ? resize(nullptr, tried) : nullptr;
-  *plugins = array;
+  // What runs in the plugins never meets an array that is not whole.
+  *plugins = nullptr;
+  zv_plugin_t** const array =
+      tried > 0 ? zv::resize_array(nullptr, static_cast<size_t>(tried)) : nullptr;
   if (array == nullptr) return 0;
-
-  const Request request = {folder.c_str(), api, min, max};
-  const int accepted = try_candidates(request, names, keep != 0, array);
-  array[accepted] = nullptr;
-  zv_plugin_t** const fitting = resize(array, accepted);
+  const int accepted = try_candidates(folder, names, {api, min, max}, keep != 0, array);
+  zv_plugin_t** const fitting = zv::resize_array(array, static_cast<size_t>(accepted));
   *plugins = fitting != nullptr ? fitting : array;
   return accepted;
 }

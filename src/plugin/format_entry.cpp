@@ -9,7 +9,7 @@ namespace {
 constexpr char separator = '|';
 constexpr const char* default_description = "All recognized formats";
 
-// Behind the entry's description and its `|`; nullptr when there is none.
+// After the entry's description and its `|`; nullptr when there is none.
 const char* patterns(const char* entry) {
   const char* const end = std::strchr(entry, separator);
   return end != nullptr ? end + 1 : nullptr;
@@ -64,7 +64,8 @@ int zv_plugin_formats(zv_plugin_t** plugins, char*** list) {
 int zv_fmt_composite(char*** list, int count, const char* description) {
   if (list == nullptr || *list == nullptr || **list == nullptr) return 0;
   if (description == nullptr || *description == '\0') description = default_description;
-  if (count < 0) count = zv_strlist_len(*list);
+  const int all = zv_strlist_len(*list);
+  if (count < 0 || count > all) count = all;
   const size_t size = composite_size(*list, count, description);
   if (size == 0) return 0;
 

@@ -24,16 +24,19 @@ struct LoadedPlugin {
   std::unique_ptr<plugin_t, ReleasePlugin> descriptor;
 };
 
-// `path` normalised and made absolute; false where that cannot be, or does not fit.
-bool canonical_path(const char* path, PathBuffer& out);
-
 // The file of a library in its folder; false when the whole does not fit.
 bool library_file(const char* folder, const char* library, PathBuffer& out);
 
+// What a host asks a plugin for.
+struct Request {
+  const char* api;
+  int min;
+  int max;
+};
+
 // Loads the library and asks its plugin, which answers in `answer`. `code` receives that answer, or
 // why there was none; without a descriptor nothing stays loaded.
-LoadedPlugin open_plugin(const char* file, const char* api, int min, int max, int* answer,
-                         int* code);
+LoadedPlugin open_plugin(const char* file, const Request& request, int* answer, int* code);
 
 }  // namespace zv
 

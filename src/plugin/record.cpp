@@ -1,18 +1,15 @@
 // Plugin records: made once, loaded and unloaded as their holder needs them.
+#include "plugin/record.h"
+
 #include <cstring>
-#include <memory>
 #include <utility>
 
-#include "plugin/loaded_plugin.h"
+#include "plugin/canonical_path.h"
 #include "plugin/no_library.h"
 
 namespace {
 
-struct DestroyRecord {
-  void operator()(zv_plugin_t* record) const { zv_plugin_destroy(record); }
-};
-
-using RecordPtr = std::unique_ptr<zv_plugin_t, DestroyRecord>;
+using zv::RecordPtr;
 
 void hold(zv_plugin_t* record, zv::LoadedPlugin plugin) {
   record->plugin = plugin.descriptor.release();
@@ -21,12 +18,12 @@ void hold(zv_plugin_t* record, zv::LoadedPlugin plugin) {
 }
 
 // nullptr when memory runs out; the plugin is let go then.
-RecordPtr make_record(zv::LoadedPlugin plugin, const char* folder, const char* lib,
+RecordPtr make_record(zv::LoadedPlugin plugin, const zv::PathBuffer& folder, const char* lib,
                       const char* api) {
   RecordPtr record(static_cast<zv_plugin_t*>(zv_calloc(sizeof(zv_plugin_t))));
   if (record == nullptr) return nullptr;
   hold(record.get(), std::move(plugin));
-  record->dir = zv_strredup(nullptr, folder);
+  record->dir = zv_strredup(nullptr, folder.c_str());
   record->lib = zv_strredup(nullptr, lib);
   record->api = zv_strredup(nullptr, api);
   const bool texts = record->dir != nullptr && record->lib != nullptr && record->api != nullptr;
@@ -34,30 +31,38 @@ RecordPtr make_record(zv::LoadedPlugin plugin, const char* folder, const char* l
   return record;
 }
 
-bool is_file_name(const char* lib) {
-  return std::strpbrk(lib, "/\\") == nullptr;
+bool may_be_asked(const char* lib, const zv::Request& request) {
+  return lib != nullptr && std::strpbrk(lib, "/\\") == nullptr && request.api != nullptr &&
+         request.min >= 0 && request.max >= request.min;
 }
 
-// `code` receives the agreed version or why there is no record.
-RecordPtr create(const char* dir, const char* lib, const char* api, int min, int max, int* code) {
+RecordPtr create(const char* dir, const char* lib, const zv::Request& request, int* code) {
   *code = ZV_PLUGIN_E_ARGUMENTS;
-  if (dir == nullptr || lib == nullptr || api == nullptr) return nullptr;
-  if (min < 0 || max < min || !is_file_name(lib)) return nullptr;
-
+  if (dir == nullptr || !may_be_asked(lib, request)) return nullptr;
   *code = ZV_PLUGIN_E_NOT_FOUND;
   zv::PathBuffer folder;
-  zv::PathBuffer file;
-  if (!zv::canonical_path(dir, folder) || !zv::library_file(folder.c_str(), lib, file))
-    return nullptr;
+  if (!zv::canonical_path(dir, folder)) return nullptr;
+  return zv::create_record(folder, lib, request, code);
+}
+
+}  // namespace
+
+zv::RecordPtr zv::create_record(const PathBuffer& folder, const char* lib, const Request& request,
+                                int* code) {
+  *code = ZV_PLUGIN_E_ARGUMENTS;
+  if (!may_be_asked(lib, request)) return nullptr;
+  *code = ZV_PLUGIN_E_NOT_FOUND;
+  PathBuffer file;
   // Windows would go on to look for a name without an extension under another one.
-  struct _stat64 st;
-  if (zv_stat(file.c_str(), &st) != 0) return nullptr;
+  if (!library_file(folder.c_str(), lib, file) ||
+      platform::lies_at(file.c_str()) == platform::Kind::none)
+    return nullptr;
 
   int version = ZV_PLUGIN_E_SILENT;
-  zv::LoadedPlugin plugin = zv::open_plugin(file.c_str(), api, min, max, &version, code);
+  LoadedPlugin plugin = open_plugin(file.c_str(), request, &version, code);
   if (plugin.descriptor == nullptr) return nullptr;
 
-  RecordPtr record = make_record(std::move(plugin), folder.c_str(), lib, api);
+  RecordPtr record = make_record(std::move(plugin), folder, lib, request.api);
   if (record == nullptr) {
     *code = ZV_PLUGIN_E_MEMORY;
     return nullptr;
@@ -66,12 +71,10 @@ RecordPtr create(const char* dir, const char* lib, const char* api, int min, int
   return record;
 }
 
-}  // namespace
-
 zv_plugin_t* zv_plugin_create(const char* dir, const char* lib, const char* api, int min, int max,
                               int* code) {
   int result = 0;
-  RecordPtr record = create(dir, lib, api, min, max, &result);
+  RecordPtr record = create(dir, lib, {api, min, max}, &result);
   if (code != nullptr) *code = result;
   return record.release();
 }
@@ -101,7 +104,7 @@ int zv_plugin_load(zv_plugin_t* rec) {
   int code = 0;
   const int agreed = rec->version;
   zv::LoadedPlugin plugin =
-      zv::open_plugin(file.c_str(), rec->api, agreed, agreed, &rec->version, &code);
+      zv::open_plugin(file.c_str(), {rec->api, agreed, agreed}, &rec->version, &code);
   rec->plugin = nullptr;
   if (plugin.descriptor == nullptr) return 0;
   hold(rec, std::move(plugin));

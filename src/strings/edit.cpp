@@ -1,22 +1,14 @@
 // Edits in place that need nothing but the text: trimming, shifting, a replaced beginning.
-#include <cctype>
 #include <cstring>
 
+#include "frame/text_view.h"
 #include "zarvo.h"
 
 namespace {
 
-// The same in every locale: the blank and what moves the cursor are white space, the graphic
-// characters of ASCII are not.
-bool is_space(char ch) {
-  if (ch > ' ' && ch <= '~') return false;
-  return ch == ' ' || (ch >= '\t' && ch <= '\r') ||
-         std::isspace(static_cast<unsigned char>(ch)) != 0;
-}
-
 // The length of the text without the white space at its end.
 size_t trimmed_length(const char* s, size_t length) {
-  while (length > 0 && is_space(s[length - 1])) --length;
+  while (length > 0 && zv::is_space(s[length - 1])) --length;
   return length;
 }
 
@@ -24,7 +16,7 @@ size_t trimmed_length(const char* s, size_t length) {
 
 size_t zv_strltrim(char* s) {
   const char* start = s;
-  while (is_space(*start)) ++start;
+  while (zv::is_space(*start)) ++start;
   const size_t length = std::strlen(start);
   if (start != s) std::memmove(s, start, length + 1);
   return length;
@@ -38,7 +30,7 @@ size_t zv_strrtrim(char* s) {
 
 size_t zv_strtrim(char* s) {
   const char* start = s;
-  while (is_space(*start)) ++start;
+  while (zv::is_space(*start)) ++start;
   const size_t length = trimmed_length(start, std::strlen(start));
   if (start != s) std::memmove(s, start, length);
   s[length] = '\0';

@@ -4,8 +4,9 @@
 // the match hopeless: a run that merely differs is tried again from the star's next place. So once
 // a run has matched up to a further star, the stars before it are settled, only the last one is
 // ever tried again, and neither recursion nor heap is needed. The match is given up as hopeless
-// once the text ends before the pattern does, or the pattern turns out malformed. The run behind
-// the last star is looked for at the end of the text alone, where it has to be.
+// once the text ends before the pattern does, or the pattern turns out malformed. The run after
+// the last star is looked for at the end of the text alone, where it has to be, and a run's leading
+// question marks are passed over with the star: `*?` matches what `?*` does.
 #include <algorithm>
 #include <array>
 #include <bit>
@@ -13,7 +14,7 @@
 #include <string_view>
 
 #include "frame/text_view.h"
-#include "strings/search.h"
+#include "strings/find.h"
 #include "zarvo.h"
 
 namespace {
@@ -48,6 +49,15 @@ Character decode_sequence(const char* p) {
 inline Character decode(const char* p) {
   const auto byte = static_cast<unsigned char>(*p);
   return byte < 0xC0 ? Character{byte, 1} : decode_sequence(p);
+}
+
+// Where the character begins that ends at `end`, in a text that begins at `first`. Only a
+// continuation can belong to the character of a byte before it.
+const char* character_before(const char* end, const char* first) {
+  constexpr ptrdiff_t longest = 6;
+  const char* start = end - 1;
+  while (is_continuation(*start) && start != first && end - start < longest) --start;
+  return start + decode(start).length == end ? start : end - 1;
 }
 
 // A set, from its opening bracket on.
@@ -102,7 +112,7 @@ std::string_view literal_head(const char* pattern) {
   return {pattern, end};
 }
 
-// The literal text that a pattern ends with. A byte of it may stand behind a `\`, which changes
+// The literal text that a pattern ends with. A byte of it may stand after a `\`, which changes
 // nothing, or in a set without its bracket, which matches nothing anyway.
 std::string_view literal_tail(const char* pattern) {
   const char* const end = pattern + std::strlen(pattern);
@@ -121,37 +131,53 @@ class Matcher {
     if (match_run() != Outcome::matched) return false;
     if (*pattern_ == '\0') return *text_ == '\0';
     text_end_ = text_ + std::strlen(text_);
-    for (bool first = true;; first = false) {
-      while (*pattern_ == '*') ++pattern_;
-      if (*pattern_ == '\0') return true;
-      const Run run = measure_run();
-      if (run.is_last) return match_last_run(run);
-      if (first && !ends_with_tail()) return false;
-      if (!(run.is_literal ? match_literal(run.length) : match_behind_star())) return false;
+    // A long text is not gone through in vain.
+    const bool is_long = text_end_ - text_ >= 64;
+    for (bool look_at_tail = is_long;; look_at_tail = false) {
+      if (!pass_star()) return false;
+      const std::string_view head = literal_head(pattern_);
+      const char after_head = pattern_[head.size()];
+      const bool starts_character = !is_continuation(*pattern_);
+      if (starts_character && after_head == '\0') return zv::has_tail({text_, text_end_}, head);
+      const bool is_literal = starts_character && after_head == '*';
+      if (!is_literal)
+        if (const size_t characters = rest_length(); characters != 0) return match_rest(characters);
+      if (look_at_tail && !ends_with_tail()) return false;
+      if (!(is_literal ? match_literal(head) : match_after_star())) return false;
     }
   }
 
  private:
-  struct Run {
-    size_t length;    // in characters
-    bool is_last;     // and well-formed
-    bool is_literal;  // its bytes stand for themselves
-  };
+  // Passes over stars and question marks, and in the text over a character for each of the latter;
+  // false when it has too few.
+  bool pass_star() {
+    for (; *pattern_ == '*' || *pattern_ == '?'; ++pattern_) {
+      if (*pattern_ == '*') continue;
+      if (text_ == text_end_) return false;
+      text_ += decode(text_).length;
+    }
+    return true;
+  }
 
-  // Measures the run behind a star.
-  Run measure_run() const {
-    Run run = {0, true, true};
-    for (const char* p = pattern_;; ++run.length) {
-      for (; !is_special(*p); ++p) ++run.length;
-      if (*p == '\0') return run;
-      if (*p == '*') return {run.length, false, run.is_literal};
-      run.is_literal = false;
+  // How many characters the rest of the pattern takes; 0 where no one number is known: it holds a
+  // star, a part of a character, or a set without its bracket.
+  size_t rest_length() const {
+    size_t characters = 0;
+    for (const char* p = pattern_;; ++characters) {
+      for (; !is_special(*p); ++characters) {
+        const int length = decode(p).length;
+        if (length == 1 && !is_ascii(*p)) return 0;
+        p += length;
+      }
+      if (*p == '\0') return characters;
+      if (*p == '*') return 0;
       if (*p == '[') {
         const Set set(p);
-        if (!set.closed()) return {run.length, false, false};
+        if (!set.closed()) return 0;
         p = set.end();
       } else {
-        p += *p == '\\' && p[1] != '\0' ? 2 : 1;
+        if (*p == '\\' && p[1] != '\0') ++p;
+        if (!is_ascii(*p++)) return 0;
       }
     }
   }
@@ -159,15 +185,22 @@ class Matcher {
   // A text that does not end like the pattern cannot match.
   bool ends_with_tail() const { return zv::has_tail({text_, text_end_}, literal_tail(pattern_)); }
 
-  // The last run must end where the text does. Where its characters are bytes there, that leaves
-  // one place for it.
-  bool match_last_run(const Run& run) {
-    if (run.length > static_cast<size_t>(text_end_ - text_)) return false;
-    const char* const start = text_end_ - run.length;
-    const bool starts_character = run.is_literal && !is_continuation(*pattern_);
-    if (!starts_character && !std::all_of(start, text_end_, is_ascii)) return match_behind_star();
+  // The last run must end where the text does. Where each part of it takes one character, that
+  // leaves one place for it.
+  bool match_rest(size_t characters) {
+    if (characters > static_cast<size_t>(text_end_ - text_)) return false;
+    const char* start = text_end_ - characters;
+    if (!std::all_of(start, text_end_, is_ascii)) start = rest_start(characters);
+    if (start == nullptr) return false;
     text_ = start;
-    return match_run() == Outcome::matched;
+    return match_run() == Outcome::matched && text_ == text_end_;
+  }
+
+  // Where so many characters begin that end with the text; nullptr when there are fewer.
+  const char* rest_start(size_t characters) const {
+    const char* start = text_end_;
+    for (; characters != 0 && start != text_; --characters) start = character_before(start, text_);
+    return characters == 0 ? start : nullptr;
   }
 
   // Matches the pattern up to its next star, or to its end, from here on.
@@ -212,21 +245,21 @@ class Matcher {
     return set.takes(character.value) ? Outcome::matched : Outcome::differs;
   }
 
-  bool match_literal(size_t length) {
-    if (is_continuation(*pattern_)) return match_behind_star();
-    text_ = zv::find({text_, text_end_}, {pattern_, length});
+  bool match_literal(std::string_view run) {
+    text_ = zv::find({text_, text_end_}, run);
     if (text_ == nullptr) return false;
-    text_ += length;
-    pattern_ += length;
+    text_ += run.size();
+    pattern_ += run.size();
     return true;
   }
 
-  // Finds the first place from here on where the run behind a star matches; the last run must also
+  // Finds the first place from here on where the run after a star matches; the last run must also
   // reach the end of the text.
-  bool match_behind_star() {
+  bool match_after_star() {
     const char* const run = pattern_;
+    const std::string_view head = literal_head(run);
     const char* start = text_;
-    while ((start = next_start(start, run)) != nullptr) {
+    while ((start = next_start(start, run, head)) != nullptr) {
       text_ = start;
       pattern_ = run;
       const Outcome outcome = match_run();
@@ -237,16 +270,13 @@ class Matcher {
     return false;
   }
 
-  // The next place from `text` on where the beginning of a run matches; nullptr when there is none.
-  const char* next_start(const char* text, const char* run) const {
+  // The next place from `text` on where a run may match that begins with `head`; nullptr when there
+  // is none.
+  const char* next_start(const char* text, const char* run, std::string_view head) const {
     if (text == text_end_) return nullptr;
-    if (*run == '?' || *run == '\\') return text;
-    if (*run == '[') return next_in_set(text, Set(run));
+    if (head.empty()) return *run == '[' ? next_in_set(text, Set(run)) : text;
     // Any other byte than a continuation can only be the first of a character.
-    if (!is_continuation(*run)) {
-      const size_t length = std::max<size_t>(literal_head(run).size(), 1);  // a lone `]` is literal
-      return zv::find({text, text_end_}, {run, length});
-    }
+    if (!is_continuation(*run)) return zv::find({text, text_end_}, head);
     while (text != text_end_ && *text != *run) text += decode(text).length;
     return text != text_end_ ? text : nullptr;
   }
@@ -265,7 +295,7 @@ class Matcher {
   const char* text_end_ = nullptr;  // measured at the first star
 };
 
-// The text behind a star, to the pattern's end.
+// The text after a star, to the pattern's end.
 bool ends_with(const char* text, std::string_view tail) {
   const size_t length = std::strlen(text);
   if (length < tail.size()) return false;
@@ -277,7 +307,7 @@ bool ends_with(const char* text, std::string_view tail) {
 
 }  // namespace
 
-// Literal text up to a star and behind it, as most patterns have it, is compared where it has to
+// Literal text up to a star and after it, as most patterns have it, is compared where it has to
 // be; the matcher gets the others, from the first character on that is not literal.
 int zv_strpat(const char* text, const char* pattern) {
   for (; !is_special(*pattern); ++text, ++pattern)

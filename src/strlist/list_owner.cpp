@@ -7,6 +7,8 @@
 #include <cstring>
 #include <utility>
 
+#include "frame/null_ended.h"
+
 namespace zv {
 
 ListOwner::ListOwner(char** list, int count) : list_(list) {
@@ -34,22 +36,18 @@ bool ListOwner::append(HeapPtr<char> text) {
 }
 
 char** ListOwner::release() {
-  // A list that cannot be cut to its size is as good as one that was.
-  if (count_ != capacity_ && !resize(count_) && list_ == nullptr) return nullptr;
+  if (!reserve(0)) return nullptr;  // the empty list is an array too
   count_ = 0;
   capacity_ = -1;
   return std::exchange(list_, nullptr);
 }
 
 bool ListOwner::grow() {
-  return count_ <= INT_MAX / 2 && resize(std::max(count_ * 2, 8));
+  return count_ < INT_MAX / 2 && resize(std::max(count_ * 2 + 1, 7));
 }
 
 bool ListOwner::resize(int capacity) {
-  const size_t entries = static_cast<size_t>(capacity) + 1;
-  void* const block = std::realloc(list_, entries * sizeof(char*));
-  if (block == nullptr) return false;
-  list_ = static_cast<char**>(block);
+  if (!resize_array(list_, static_cast<size_t>(capacity))) return false;
   list_[count_] = nullptr;
   capacity_ = capacity;
   return true;

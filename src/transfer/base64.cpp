@@ -1,3 +1,4 @@
+// Base64, and the login texts made with it.
 #include "transfer/base64.h"
 
 #include "frame/text_buffer.h"
@@ -15,11 +16,6 @@ using Credentials = TextBuffer<2 * ZV_PATH_MAX + 2>;
 char* put_group(char* out, unsigned bits, int count) {
   for (int i = 0; i < count; ++i) *out++ = alphabet[bits >> (18 - 6 * i) & 63];
   return out;
-}
-
-HeapPtr<char> encoded(const Credentials& text) {
-  const auto* const bytes = reinterpret_cast<const unsigned char*>(text.c_str());
-  return HeapPtr<char>(base64_encode(bytes, text.size(), nullptr));
 }
 
 }  // namespace
@@ -40,12 +36,32 @@ char* base64_encode(const unsigned char* data, size_t size, char* out) {
   return out;
 }
 
+size_t base64_lines(std::span<const char> bytes, char* text) {
+  const auto* const data = reinterpret_cast<const unsigned char*>(bytes.data());
+  char* end = text;
+  size_t done = 0;
+  do {
+    const size_t piece = std::min(base64_line_bytes, bytes.size() - done);
+    base64_encode(data + done, piece, end);
+    end += base64_length(piece);
+    *end++ = '\r';
+    *end++ = '\n';
+    done += piece;
+  } while (done < bytes.size());
+  return static_cast<size_t>(end - text);
+}
+
+HeapPtr<char> base64_text(std::string_view text) {
+  const auto* const bytes = reinterpret_cast<const unsigned char*>(text.data());
+  return HeapPtr<char>(base64_encode(bytes, text.size(), nullptr));
+}
+
 HeapPtr<char> basic_credentials(const char* user, const char* password) {
   Credentials text;
   if (user == nullptr || *user == '\0' || !text.append(user)) return nullptr;
   const bool has_password = password != nullptr && *password != '\0';
   if (has_password && !(text.append(':') && text.append(password))) return nullptr;
-  return encoded(text);
+  return base64_text(text.view());
 }
 
 HeapPtr<char> plain_credentials(const char* user, const char* password) {
@@ -54,7 +70,7 @@ HeapPtr<char> plain_credentials(const char* user, const char* password) {
   Credentials text;
   const bool fits = text.append('\0') && text.append(user) && text.append('\0') &&
                     text.append(has_password ? password : user);
-  return fits ? encoded(text) : nullptr;
+  return fits ? base64_text(text.view()) : nullptr;
 }
 
 }  // namespace zv

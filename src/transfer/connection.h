@@ -1,48 +1,19 @@
-// What a client holds while it runs, released in one order on every way out.
+// What every client of zv_copy() begins and ends with: the local file, the buffer, the control
+// connection.
 #ifndef ZARVO_TRANSFER_CONNECTION_H
 #define ZARVO_TRANSFER_CONNECTION_H
 
 #include <span>
 
 #include "frame/owner.h"
-#include "platform/platform.h"
+#include "transfer/local_file.h"
+#include "transfer/location.h"
+#include "transfer/network.h"
 #include "transfer/result.h"
 
 namespace zv {
 
-// Keeps the network layer started for a scope; starts are counted, so guards may nest.
-class NetworkGuard {
- public:
-  NetworkGuard() : started_(platform::network_start()) {}
-  ~NetworkGuard() {
-    if (started_) platform::network_stop();
-  }
-  NetworkGuard(const NetworkGuard&) = delete;
-  NetworkGuard& operator=(const NetworkGuard&) = delete;
-
-  bool started() const { return started_; }
-
- private:
-  bool started_;
-};
-
-// A stream socket, or none.
-class SocketOwner {
- public:
-  SocketOwner() = default;
-  ~SocketOwner() { close(); }
-  SocketOwner(const SocketOwner&) = delete;
-  SocketOwner& operator=(const SocketOwner&) = delete;
-
-  bool open();
-  void close();  // no effect when it is closed already
-  platform::Socket get() const { return socket_; }
-
- private:
-  platform::Socket socket_ = platform::no_socket;
-};
-
-// Room for one block of data, or for one reply and the NUL behind it.
+// Room for one block of data, or for one reply and the NUL after it.
 class TransferBuffer {
  public:
   bool allocate(size_t block_size);
@@ -54,14 +25,14 @@ class TransferBuffer {
   size_t block_size_ = 0;
 };
 
-// One client's run. The members are released from the last to the first: the local file, the
-// buffer, the data socket, the control socket, the network layer.
+// What a client holds while it runs. The members are released from the last to the first: the local
+// file, the buffer, the data socket, the control socket, the network layer.
 struct Connection {
   explicit Connection(Direction way) : direction(way) {}
 
   // Makes the control socket and the buffer, which follows the socket's own buffer for that
   // direction, and connects. Gives `copied`, or the code of the side that failed.
-  int open(const platform::Address& address, unsigned port);
+  int open(const Location& location);
 
   int network_failed() const { return zv::network_failed(direction); }
   int local_failed() const { return zv::local_failed(direction); }
@@ -72,13 +43,31 @@ struct Connection {
   SocketOwner data;
   TransferBuffer buffer;
   StreamPtr file;
+  int64_t size = 0;  // of an upload's file
 };
 
-// The source of an upload: its size, and the file opened for reading. A directory is refused.
-bool open_source(const char* path, StreamPtr& file, int64_t& size);
+// A download from its opening to its end: the destination is made or emptied before the server is
+// called, and counts once it is closed. `talk(connection)` is the dialogue between.
+template <class Talk>
+int download_over(const Location& source, const char* local, Talk talk) {
+  Connection connection(Direction::download);
+  if (!connection.network.started()) return source_failed;
+  if (!open_destination(local, connection.file)) return destination_failed;
+  int result = connection.open(source);
+  if (result == copied) result = talk(connection);
+  if (result == copied && !close_stream(connection.file)) result = destination_failed;
+  return result;
+}
 
-// The destination of a download, made or emptied.
-bool open_destination(const char* path, StreamPtr& file);
+// An upload likewise.
+template <class Talk>
+int upload_over(const char* local, const Location& destination, Talk talk) {
+  Connection connection(Direction::upload);
+  if (!connection.network.started()) return destination_failed;
+  if (!open_source(local, connection.file, connection.size)) return source_failed;
+  const int result = connection.open(destination);
+  return result == copied ? talk(connection) : result;
+}
 
 }  // namespace zv
 

@@ -1,3 +1,4 @@
+// Formats the Date line.
 #include "transfer/date_line.h"
 
 #include <cstdio>

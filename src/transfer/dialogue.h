@@ -15,13 +15,13 @@ class Dialogue {
   explicit Dialogue(const Connection& connection) : connection_(connection) {}
 
   // Reads the next reply and gives its code.
-  [[nodiscard]] int hear() const;
+  [[nodiscard]] int read_reply() const;
 
-  // Sends the command and its line end, then hears. A command that holds a line end itself would be
-  // two, and is not sent.
-  [[nodiscard]] int ask(Pieces command) const;
+  // Sends the command and its line end, then reads the reply. A command that holds a line end
+  // itself would be two, and is not sent.
+  [[nodiscard]] int send_command(Words command) const;
 
-  // The last line of the reply that was heard last.
+  // The last line of the reply that was read last.
   const char* reply() const { return connection_.buffer.room().data(); }
 
  private:

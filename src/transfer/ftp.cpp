@@ -1,24 +1,26 @@
+// The FTP dialogue of zv_copy().
 #include "transfer/ftp.h"
 
+#include "transfer/body.h"
 #include "transfer/connection.h"
 #include "transfer/dialogue.h"
 #include "transfer/number.h"
-#include "transfer/pump.h"
 #include "transfer/reply.h"
 
 namespace zv {
 
 namespace {
 
-const char* or_default(const char* text, const char* standard) {
-  return *text != '\0' ? text : standard;
+std::string_view or_default(const PathBuffer& text, std::string_view standard) {
+  return text.empty() ? standard : text.view();
 }
 
 // A server may do without the password, or without the user.
-bool log_in(const Dialogue& server, const char* user, const char* password) {
-  int code = server.hear();
-  if (code == 220) code = server.ask({"USER ", or_default(user, "anonymous")});
-  if (code == 331) code = server.ask({"PASS ", or_default(password, "zarvo@zarvo.test")});
+bool log_in(const Dialogue& server, const Location& location) {
+  int code = server.read_reply();
+  if (code == 220) code = server.send_command({"USER ", or_default(location.user, "anonymous")});
+  if (code == 331)
+    code = server.send_command({"PASS ", or_default(location.password, "zarvo@zarvo.test")});
   return code == 230;
 }
 
@@ -26,19 +28,19 @@ bool log_in(const Dialogue& server, const char* user, const char* password) {
 bool open_data(Connection& connection, const Dialogue& server) {
   platform::Address address;
   unsigned port = 0;
-  return server.ask({"TYPE I"}) == 200 && server.ask({"PASV"}) == 227 && connection.data.open() &&
-         parse_pasv(server.reply(), address, port) &&
+  return server.send_command({"TYPE I"}) == 200 && server.send_command({"PASV"}) == 227 &&
+         connection.data.open() && parse_pasv(server.reply(), address, port) &&
          platform::socket_connect(connection.data.get(), address, port);
 }
 
-bool begin(Connection& connection, const Dialogue& server, const char* user, const char* password) {
-  return log_in(server, user, password) && open_data(connection, server);
+bool begin(Connection& connection, const Dialogue& server, const Location& location) {
+  return log_in(server, location) && open_data(connection, server);
 }
 
 // The server takes the closed data connection for the end of a stored file.
 bool finish(Connection& connection, const Dialogue& server) {
   connection.data.close();
-  return server.hear() == 226 && server.ask({"QUIT"}) == 221;
+  return server.read_reply() == 226 && server.send_command({"QUIT"}) == 221;
 }
 
 // The bytes that a 150 reply announces, "(1234 bytes)"; 0 for none.
@@ -50,50 +52,38 @@ int64_t announced_size(std::string_view reply) {
   return take_number(reply, size) ? size : 0;
 }
 
-int retrieve(Connection& connection, const Dialogue& server, const char* remote) {
-  if (server.ask({"RETR ", remote}) != 150) return source_failed;
+int retrieve(Connection& connection, const Location& source) {
+  const Dialogue server(connection);
+  if (!begin(connection, server, source) ||
+      server.send_command({"RETR ", source.path.view()}) != 150)
+    return source_failed;
   const int64_t size = announced_size(server.reply());
   if (size <= 0) return source_failed;
-  return recv_to_file(connection.data.get(), connection.file.get(), connection.buffer.block(),
-                      size);
+  const int result =
+      recv_to_file(connection.data.get(), connection.file.get(), connection.buffer.block(), size);
+  return result != copied || finish(connection, server) ? result : source_failed;
 }
 
-int store(Connection& connection, const Dialogue& server, int64_t size, const char* remote) {
-  if (server.ask({"STOR ", remote}) != 150) return destination_failed;
-  return send_from_file(connection.data.get(), connection.file.get(), connection.buffer.block(),
-                        size);
+int store(Connection& connection, const Location& destination) {
+  const Dialogue server(connection);
+  if (!begin(connection, server, destination) ||
+      server.send_command({"STOR ", destination.path.view()}) != 150)
+    return destination_failed;
+  const int result = send_from_file(connection.data.get(), connection.file.get(),
+                                    connection.buffer.block(), connection.size);
+  return result != copied || finish(connection, server) ? result : destination_failed;
 }
 
 }  // namespace
 
-int ftp_download(const platform::Address& addr, unsigned port, const char* user,
-                 const char* password, const char* remote, const char* local) {
-  Connection connection(Direction::download);
-  if (!connection.network.started()) return source_failed;
-  if (!open_destination(local, connection.file)) return destination_failed;
-
-  const Dialogue server(connection);
-  int result = connection.open(addr, port);
-  if (result == copied && !begin(connection, server, user, password)) result = source_failed;
-  if (result == copied) result = retrieve(connection, server, remote);
-  if (result == copied && !finish(connection, server)) result = source_failed;
-  if (result == copied && !close_stream(connection.file)) result = destination_failed;
-  return result;
+int ftp_download(const Location& source, const char* local) {
+  return download_over(source, local,
+                       [&](Connection& connection) { return retrieve(connection, source); });
 }
 
-int ftp_upload(const platform::Address& addr, unsigned port, const char* user, const char* password,
-               const char* local, const char* remote) {
-  Connection connection(Direction::upload);
-  if (!connection.network.started()) return destination_failed;
-  int64_t size = 0;
-  if (!open_source(local, connection.file, size)) return source_failed;
-
-  const Dialogue server(connection);
-  int result = connection.open(addr, port);
-  if (result == copied && !begin(connection, server, user, password)) result = destination_failed;
-  if (result == copied) result = store(connection, server, size, remote);
-  if (result == copied && !finish(connection, server)) result = destination_failed;
-  return result;
+int ftp_upload(const char* local, const Location& destination) {
+  return upload_over(local, destination,
+                     [&](Connection& connection) { return store(connection, destination); });
 }
 
 }  // namespace zv

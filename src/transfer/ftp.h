@@ -2,17 +2,15 @@
 #ifndef ZARVO_TRANSFER_FTP_H
 #define ZARVO_TRANSFER_FTP_H
 
-#include "platform/platform.h"
+#include "transfer/location.h"
 
 namespace zv {
 
-// Retrieves `remote` into the local file, which is made or emptied first. 0, -3 or -4.
-int ftp_download(const platform::Address& addr, unsigned port, const char* user,
-                 const char* password, const char* remote, const char* local);
+// Retrieves the source into the local file, which is made or emptied first. 0, -3 or -4.
+int ftp_download(const Location& source, const char* local);
 
-// Stores the local file at `remote`. 0, -3 or -4.
-int ftp_upload(const platform::Address& addr, unsigned port, const char* user, const char* password,
-               const char* local, const char* remote);
+// Stores the local file at the destination. 0, -3 or -4.
+int ftp_upload(const char* local, const Location& destination);
 
 }  // namespace zv
 

@@ -2,17 +2,15 @@
 #ifndef ZARVO_TRANSFER_HTTP_H
 #define ZARVO_TRANSFER_HTTP_H
 
-#include "platform/platform.h"
+#include "transfer/location.h"
 
 namespace zv {
 
-// Fetches `remote` into the local file, which is made or emptied first. 0, -3 or -4.
-int http_get(const platform::Address& addr, unsigned port, const char* user, const char* password,
-             const char* remote, const char* local);
+// Fetches the source into the local file, which is made or emptied first. 0, -3 or -4.
+int http_get(const Location& source, const char* local);
 
-// Stores the local file at `remote`. 0, -3 or -4.
-int http_put(const platform::Address& addr, unsigned port, const char* user, const char* password,
-             const char* local, const char* remote);
+// Stores the local file at the destination. 0, -3 or -4.
+int http_put(const char* local, const Location& destination);
 
 }  // namespace zv
 

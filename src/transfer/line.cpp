@@ -1,11 +1,12 @@
+// Building and sending lines.
 #include "transfer/line.h"
 
 namespace zv {
 
-bool build_line(LineBuffer& line, Pieces pieces) {
+bool build_line(LineBuffer& line, Words words) {
   line.clear();
-  for (const std::string_view piece : pieces)
-    if (!line.append(piece)) return false;
+  for (const std::string_view word : words)
+    if (!line.append(word)) return false;
   return true;
 }
 

@@ -13,10 +13,10 @@ namespace zv {
 // Holds the longest line, or whole HTTP request, that a location's path and credentials can give.
 using LineBuffer = TextBuffer<2048>;
 
-using Pieces = std::initializer_list<std::string_view>;
+using Words = std::initializer_list<std::string_view>;
 
 // False when the line does not fit.
-[[nodiscard]] bool build_line(LineBuffer& line, Pieces pieces);
+[[nodiscard]] bool build_line(LineBuffer& line, Words words);
 
 // What no line and no text that goes into one may hold.
 inline bool holds_line_end(std::string_view text) {

@@ -9,7 +9,7 @@ namespace zv {
 
 enum LocationKind { LOC_NONE, LOC_FILE, LOC_FTP, LOC_HTTP, LOC_SMTP };
 
-struct location_t {
+struct Location {
   LocationKind kind = LOC_NONE;
   platform::Address addr = {};
   unsigned port = 0;  // in host order
@@ -21,17 +21,7 @@ struct location_t {
 // Takes a location text apart; host names are looked up. Gives the kind, which stands in the
 // location too; LOC_NONE, for a text that is not usable, leaves the rest of it undefined. No text
 // of a network kind holds CR or LF, so none can add a line to a dialogue.
-LocationKind parse_location(const char* text, location_t& location);
-
-// Takes "[user[:password]@]host[:port]" off the front of the location's path and stores its parts;
-// a port that the text does not name stays as it was. False leaves the location undefined.
-bool split_authority(location_t& location);
-
-// A name is looked up, four decimal numbers are taken as they stand.
-bool resolve_host(const char* host, platform::Address& address);
-
-// Replaces each "%" with two hexadecimal digits behind it by the byte they give, in place.
-void percent_decode(char* text);
+LocationKind parse_location(const char* text, Location& location);
 
 }  // namespace zv
 

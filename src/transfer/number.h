@@ -2,18 +2,15 @@
 #ifndef ZARVO_TRANSFER_NUMBER_H
 #define ZARVO_TRANSFER_NUMBER_H
 
-#include <cctype>
 #include <charconv>
 #include <limits>
 #include <span>
 #include <string_view>
 #include <system_error>
 
-namespace zv {
+#include "frame/text_view.h"
 
-inline bool is_space(char ch) {
-  return std::isspace(static_cast<unsigned char>(ch)) != 0;
-}
+namespace zv {
 
 // Takes a number off the front of the text: white space, an optional sign, digits. False when there
 // is none (the number is 0) or when it does not fit (the number is the nearest limit).
@@ -43,9 +40,9 @@ inline bool take_numbers(std::string_view& text, char separator, std::span<int> 
   return true;
 }
 
-// The number behind the first word of a line.
+// The number after the first word of a line.
 template <class Number>
-bool number_behind_word(std::string_view line, Number& number) {
+bool number_after_word(std::string_view line, Number& number) {
   while (!line.empty() && is_space(line.front())) line.remove_prefix(1);
   while (!line.empty() && !is_space(line.front())) line.remove_prefix(1);
   return take_number(line, number);

@@ -1,3 +1,4 @@
+// Reads numbered replies and HTTP headers, each out of what one receive brings.
 #include "transfer/reply.h"
 
 #include <array>
@@ -13,7 +14,7 @@ namespace {
 
 constexpr size_t none = std::string_view::npos;
 
-// One receive's bytes with a NUL behind them: their count, -1 on failure.
+// One receive's bytes with a NUL after them: their count, -1 on failure.
 int64_t receive_text(platform::Socket socket, std::span<char> room) {
   const int64_t received = platform::socket_receive(socket, room.data(), room.size() - 1);
   room[received > 0 ? static_cast<size_t>(received) : 0] = '\0';
@@ -48,7 +49,7 @@ int64_t find_content_length(std::string_view lines) {
   std::string_view line = take_line(lines);
   while (!line.empty() && !begins_with(line, name)) line = take_line(lines);
   int64_t length = 0;
-  return number_behind_word(line, length) ? length : 0;
+  return number_after_word(line, length) ? length : 0;
 }
 
 }  // namespace
@@ -79,7 +80,7 @@ HttpHeader read_http_header(platform::Socket socket, std::span<char> room) {
   std::string_view lines(text.data(), end);
   const std::string_view status_line = take_line(lines);
   if (!begins_with(status_line, "HTTP/")) return header;
-  if (!number_behind_word(status_line, header.status)) header.status = 0;
+  if (!number_after_word(status_line, header.status)) header.status = 0;
   header.content_length = find_content_length(lines);
 
   const size_t body = end + blank_line.size();

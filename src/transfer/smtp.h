@@ -2,13 +2,13 @@
 #ifndef ZARVO_TRANSFER_SMTP_H
 #define ZARVO_TRANSFER_SMTP_H
 
-#include "platform/platform.h"
+#include "transfer/location.h"
 
 namespace zv {
 
-// Mails the local file to the recipient's address. 0, -3 or -4.
-int smtp_send_file(const platform::Address& addr, unsigned port, const char* user,
-                   const char* password, const char* local, const char* recipient);
+// Mails the local file to the address that the destination's path is, its slash left out. 0, -3 or
+// -4.
+int smtp_send_file(const char* local, const Location& destination);
 
 }  // namespace zv
 

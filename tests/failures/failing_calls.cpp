@@ -1,102 +1,75 @@
-// The allocation functions that the linker puts in place of the C library's, and what decides
-// whether a call fails.
+// What decides whether a call fails, and the calls that fail on both platforms.
 #include "failures/failing_calls.h"
 
-#include <algorithm>
-#include <array>
+#include <pthread.h>
+
 #include <atomic>
 #include <cerrno>
 #include <cstdio>
-
-#ifdef _WIN32
-#include <windows.h>
-#else
-#include <pthread.h>
-#endif
+#include <cstdlib>
+#include <mutex>
 
 namespace failing {
 
 namespace {
 
-// Not a thread_local variable, which may need the memory that is to fail.
-unsigned long this_thread() {
-#ifdef _WIN32
-  return GetCurrentThreadId();
-#else
-  return pthread_self();
-#endif
-}
-
-// Blocks of the tested calls. The room ends a test that leaks wildly, and no other.
-class Blocks {
- public:
-  void add(void* block) {
-    if (block != nullptr) blocks_.at(count_++) = block;
-  }
-  void remove(void* block) {
-    void** const end = blocks_.data() + count_;
-    void** const found = std::find(blocks_.data(), end, block);
-    if (found != end) *found = blocks_[--count_];
-  }
-  void clear() { count_ = 0; }
-  size_t count() const { return count_; }
-
- private:
-  std::array<void*, 10000> blocks_;
-  size_t count_ = 0;
-};
-
-std::atomic<unsigned long> attempting = 0;  // the thread that may be disturbed; 0 for none
-Attempt* attempt = nullptr;                 // this and all below are that thread's
+std::mutex mutex;  // a test may call the library on many threads
+Attempt* attempt = nullptr;
 bool in_scope = false;
 Fault current;
 int left = 0;
-std::string_view met;
-Blocks blocks;
-
-bool is_attempting() {
-  return attempting == this_thread();
-}
+int calls = 0;
+std::string_view failure;
+std::atomic<int> blocks = 0;
 
 }  // namespace
 
 Attempt::Attempt(const Fault& fault, int skipped) {
   current = fault;
   left = skipped;
-  met = {};
-  blocks.clear();
+  calls = 0;
+  failure = {};
   attempt = this;
-  attempting = this_thread();
 }
 
 Attempt::~Attempt() {
-  attempting = 0;
+  attempt = nullptr;
 }
 
 std::string_view Attempt::failed() const {
-  return met;
+  return failure;
 }
 
-int Attempt::blocks_kept() const {
-  return static_cast<int>(blocks.count());
+int Attempt::met() const {
+  return calls;
 }
 
-Attempt::Scope::Scope() {
+void Attempt::begin() {
   in_scope = true;
 }
 
-Attempt::Scope::~Scope() {
+void Attempt::end() {
   in_scope = false;
 }
 
-bool is_tested(std::string_view call) {
-  return is_attempting() && in_scope && current.call == call;
+int blocks_in_use() {
+  return blocks;
 }
 
-bool fails(std::string_view call, bool needs_memory) {
-  if (!is_tested(call) && !(needs_memory && is_tested(all_memory))) return false;
-  if (!met.empty() || left-- > 0) return false;
-  met = call;
+bool is_tested(std::string_view call) {
+  return attempt != nullptr && in_scope && current.call == call;
+}
+
+bool fails(std::string_view call, Kind kind) {
+  const std::lock_guard<std::mutex> lock(mutex);
+  const bool is_memory = kind == Kind::allocation || kind == Kind::system_with_memory;
+  const bool is_system = kind == Kind::system || kind == Kind::system_with_memory;
+  if (!is_tested(call) && !(is_memory && is_tested(all_memory)) &&
+      !(is_system && is_tested(all_calls)))
+    return false;
+  ++calls;
+  if (!failure.empty() || left-- > 0) return false;
+  failure = call;
   if (current.error == disturbed) {
     in_scope = false;
     attempt->meanwhile();
@@ -115,47 +88,38 @@ bool is_shortened() {
 
 extern "C" {
 
-void* __real_malloc(size_t size);
-void* __real_calloc(size_t count, size_t size);
-void* __real_realloc(void* block, size_t size);
-void __real_free(void* block);
-FILE* __real_fopen(const char* path, const char* mode);
+using failing::fails;
+using failing::Kind;
 
-namespace {
-
-void* noted(void* block) {
-  if (failing::is_attempting() && failing::in_scope) failing::blocks.add(block);
+void* failing_malloc(size_t size) {
+  void* const block = fails("malloc", Kind::allocation) ? nullptr : malloc(size);
+  failing::blocks += block != nullptr;
   return block;
 }
 
-void forget(void* block) {
-  if (failing::is_attempting()) failing::blocks.remove(block);
+void* failing_calloc(size_t count, size_t size) {
+  void* const block = fails("calloc", Kind::allocation) ? nullptr : calloc(count, size);
+  failing::blocks += block != nullptr;
+  return block;
 }
 
-}  // namespace
-
-void* __wrap_malloc(size_t size) {
-  return failing::fails("malloc", true) ? nullptr : noted(__real_malloc(size));
+void* failing_realloc(void* block, size_t size) {
+  void* const moved = fails("realloc", Kind::allocation) ? nullptr : realloc(block, size);
+  failing::blocks += block == nullptr && moved != nullptr;
+  return moved;
 }
 
-void* __wrap_calloc(size_t count, size_t size) {
-  return failing::fails("calloc", true) ? nullptr : noted(__real_calloc(count, size));
+void failing_free(void* block) {
+  failing::blocks -= block != nullptr;
+  free(block);
 }
 
-void* __wrap_realloc(void* block, size_t size) {
-  if (failing::fails("realloc", true)) return nullptr;
-  void* const moved = __real_realloc(block, size);
-  if (moved == nullptr) return nullptr;
-  forget(block);
-  return noted(moved);
+FILE* failing_fopen(const char* path, const char* mode) {
+  return fails("fopen", Kind::system_with_memory) ? nullptr : fopen(path, mode);
 }
 
-void __wrap_free(void* block) {
-  forget(block);
-  __real_free(block);
-}
-
-FILE* __wrap_fopen(const char* path, const char* mode) {
-  return failing::fails("fopen", true) ? nullptr : __real_fopen(path, mode);
+// Only where it is named: it can only fail when it is the first.
+int failing_pthread_mutex_lock(pthread_mutex_t* mutex) {
+  return fails("pthread_mutex_lock", Kind::only_by_name) ? ENOMEM : pthread_mutex_lock(mutex);
 }
 }

@@ -15,7 +15,7 @@ from pathlib import Path
 
 from installed import CONSUMER, Installed, run, start
 
-NAMES = ["libzarvo1", "libzarvo-dev", "zv"]
+NAMES = ["libzarvo1", "libzarvo-tls1", "libzarvo-dev", "zv"]
 
 
 def installed_names():
@@ -54,6 +54,10 @@ class Debian(unittest.TestCase):
 
     def test_1_tool(self):
         self.assertEqual(run("zv", "--version"), "zv 1.0.0b\n")
+        for name, field, value in (("libzarvo1", "Depends", r"libc6 \(>= [\d.]+\)"),
+                                   ("libzarvo-tls1", "Depends", r"libc6 .*, libssl3 .*"),
+                                   ("zv", "Recommends", "libzarvo-tls1")):
+            self.assertRegex(run("dpkg-query", "-W", "-f", "${%s}" % field, name), f"^{value}$")
         completion = "/usr/share/bash-completion/completions/zv"
         self.assertIn("zv", run("bash", "-c", f"source {completion} && complete -p zv"))
 

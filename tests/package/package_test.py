@@ -12,7 +12,8 @@ from pathlib import Path
 
 from installed import WARNINGS, Installed, run
 
-WINDOWS_OWN = {"kernel32.dll", "msvcrt.dll", "advapi32.dll", "ws2_32.dll"}
+WINDOWS_OWN = {"kernel32.dll", "msvcrt.dll", "advapi32.dll", "ws2_32.dll", "crypt32.dll",
+               "secur32.dll"}
 
 
 class Package(unittest.TestCase):
@@ -24,6 +25,7 @@ class Package(unittest.TestCase):
         run("cmake", "--install", args.build, "--prefix", cls.prefix)
         cls.installed = Installed(cls.root, cls.prefix, args.cc, args.toolchain, args.emulator)
         cls.library = cls.prefix / ("bin/zarvo.dll" if args.windows else "lib/libzarvo.so")
+        cls.encryption = cls.prefix / "lib/libzarvo_tls.so.1"  # where OpenSSL is
         cls.declared = re.findall(r"^ZV_API [^;(]*?(\w+)\(", (args.source / "include/zarvo.h")
                                   .read_text(), flags=re.M)
 
@@ -42,11 +44,23 @@ class Package(unittest.TestCase):
             programs / f"gallery{suffix}", programs.parent / "gallery_plugins", "pictures",
             "sheet.png"), r"Tiles\.BMP +Windows bitmap +240 x 160")
 
+    def test_inside_another_tree(self):
+        """The library's own tests and programs are none of an including program's targets."""
+        build = self.root / "inside"
+        run("cmake", "-S", args.source / "tests/package/consumer", "-B", build, "-G", "Ninja",
+            f"-DZARVO_TREE={args.source}", f"-DCMAKE_C_COMPILER={args.cc}")
+        targets = re.findall(r"^((?:zarvo|zv|gtest|test)\w*): phony$",
+                             run("ninja", "-C", build, "-t", "targets"), flags=re.M)
+        self.assertEqual(sorted({*targets} - {"zarvo_tls"}),
+                         ["zarvo", "zarvo_objects", "zarvo_static"])
+
     def test_header_compiles_alone(self):
         for name, *compiler in (("a.c", args.cc, "-std=c99", "-Wstrict-prototypes"),
-                                ("a.cpp", args.cxx, "-std=c++11")):
+                                ("a.cpp", args.cxx, "-std=c++11"),
+                                ("a.hpp.cpp", args.cxx, "-std=c++17")):
             source = self.root / name
-            source.write_text("#include <zarvo.h>\n#include <zarvo.h>\n")
+            header = "zarvo.hpp" if "hpp" in name else "zarvo.h"
+            source.write_text(f"#include <{header}>\n" * 2)
             run(*compiler, *WARNINGS, "-fsyntax-only", source, "-I", self.prefix / "include")
 
     def test_exports_are_the_headers(self):
@@ -67,12 +81,18 @@ class Package(unittest.TestCase):
                       re.findall(r"DLL Name: (\S+)", run(args.objdump, "-p", self.library))}
             self.assertLessEqual(needed, WINDOWS_OWN)
         else:
-            dynamic = run("readelf", "-dW", self.library)
-            self.assertEqual(re.findall(r"\(NEEDED\).*\[(.*)\]", dynamic), ["libc.so.6"])
-            self.assertEqual(re.findall(r"\(SONAME\).*\[(.*)\]", dynamic), ["libzarvo.so.1"])
+            for library, name, needed in (
+                    (self.library, "libzarvo.so.1", ["libc.so.6"]),
+                    (self.encryption, "libzarvo_tls.so.1",
+                     ["libssl.so.3", "libcrypto.so.3", "libc.so.6"])):
+                if library == self.library or library.exists():
+                    dynamic = run("readelf", "-dW", library)
+                    self.assertEqual(re.findall(r"\(NEEDED\).*\[(.*)\]", dynamic), needed)
+                    self.assertEqual(re.findall(r"\(SONAME\).*\[(.*)\]", dynamic), [name])
 
     def test_hardening(self):
-        for file in (self.library, self.prefix / ("bin/zv.exe" if args.windows else "bin/zv")):
+        programs = [self.library, self.prefix / ("bin/zv.exe" if args.windows else "bin/zv")]
+        for file in programs + [self.encryption] * self.encryption.exists():
             if args.windows:
                 text = run(args.objdump, "-p", "-t", file)
                 wanted = ["HIGH_ENTROPY_VA", "DYNAMIC_BASE", "NX_COMPAT", "__stack_chk_fail"]

@@ -1,12 +1,12 @@
 #!/usr/bin/env python3
-"""Compiles and runs every example of the documents: README, the public header's families and, made
-from those, the manual pages of section 3; and the command lines that zv's help and page show.
+"""Compiles and runs every example of the documents: README, the public headers' families and, made
+from those of C, the manual pages of section 3; and the command lines that zv's help and page show.
 
 A block of C that has neither a main() nor a ZV_PLUGIN_EXPORT is the body of a main(). It must end
 with 0 and print what its comments `// prints TEXT` say, spaces and lines aside. Hosts of example.com
 and example.org stand for the servers of tests/servers/with_servers, which the test runs beside.
 
-    documents_test.py SOURCE WORK_FOLDER LIBRARY ZV CC [EMULATOR]
+    documents_test.py SOURCE WORK_FOLDER LIBRARY ZV CC CXX [EMULATOR]
 """
 import os
 import re
@@ -18,7 +18,7 @@ from pathlib import Path
 
 import programs
 
-WARNINGS = ["-std=c99", "-Wall", "-Wextra", "-Wpedantic", "-Wconversion", "-Wshadow", "-Werror"]
+WARNINGS = ["-Wall", "-Wextra", "-Wpedantic", "-Wconversion", "-Wshadow", "-Werror"]
 FRAME = """#include <stdio.h>
 #include <stdlib.h>
 #include <string.h>
@@ -61,9 +61,12 @@ def run(*command):
 
 
 def build(text, program, *words):
-    file = work / "example.c"
+    """In C99, or in C++17 where the text includes that header."""
+    layer = "zarvo.hpp" in text
+    file = work / ("example.cpp" if layer else "example.c")
     file.write_text(text + "\n")
-    run(cc, *WARNINGS, "-I", source / "include", file, "-o", program, *words, library)
+    run(*([cxx, "-std=c++17", *(["-static"] if emulator else [])] if layer else [cc, "-std=c99"]),
+        *WARNINGS, "-I", source / "include", file, "-o", program, *words, library)
     return program
 
 
@@ -76,6 +79,8 @@ class Documents(unittest.TestCase):
         Path(given["ZARVO_TEST_HTTP_ROOT"], "data.bin").write_text("data")
         cls.families = header.read(source / "include/zarvo.h")[1]
         cls.blocks = ["\n".join(lines) for family in cls.families for lines in family.examples]
+        layer = re.search(r"(?s)@code\{.cpp\}\n(.*) \* @endcode", (source / "include/zarvo.hpp").read_text())
+        cls.blocks.append(FRAME.replace(".h>\n\n", ".hpp>\n\n") % re.sub(r"(?m)^ \* ", "", layer[1]))
         plugin, = (block for block in cls.blocks if "ZV_PLUGIN_EXPORT" in block)
         cls.blocks.remove(plugin)
         build(FRAME.split("int main")[0] + plugin, work / "plugins/img_sample.dll", "-shared", "-fPIC")
@@ -111,7 +116,7 @@ class Documents(unittest.TestCase):
             self.assertIn(command.split(" ")[-1], self.page)
 
     def test_readme_and_families(self):
-        blocks = re.findall(r"```c\n(.*?)```", (source / "README.md").read_text(), flags=re.S)
+        blocks = re.findall(r"```c(?:pp)?\n(.*?)```", (source / "README.md").read_text(), flags=re.S)
         self.assertTrue(blocks)
         self.assertEqual([family.name for family in self.families if not family.examples], [])
         for block in blocks + self.blocks:
@@ -133,7 +138,7 @@ class Documents(unittest.TestCase):
 
 
 source, work, library, zv = (Path(word).absolute() for word in sys.argv[1:5])
-cc, emulator = sys.argv[5], sys.argv[6:]
+cc, cxx, *emulator = sys.argv[5:]
 sys.path.insert(0, str(source / "docs"))
 import header  # noqa: E402  pylint: disable=wrong-import-position
 

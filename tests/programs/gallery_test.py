@@ -86,7 +86,9 @@ class Gallery(unittest.TestCase):
             self.assertTrue(lines[name][0].endswith(why), lines[name][0])
 
     def test_contact_sheet(self):
-        lines = self.show()
+        pictures = "\u00fc \u0436 \u65e5"
+        (self.folder / "pictures").rename(self.folder / pictures)
+        lines = self.show(pictures)
         width, height, rows = decode_png((self.folder / "sheet.png").read_bytes())
         self.assertEqual((width, height), (GAP + COLUMNS * (BOX + GAP),
                                            GAP + (len(lines) + 3) // 4 * (BOX + BAR + 2 * GAP)))

@@ -19,9 +19,18 @@ http {
   scgi_temp_path @DIR@/scgi;
   server {
     listen 127.0.0.1:@PORT@;
+    @LISTEN_SIX@
     root @DIR@/http;
     dav_methods PUT;
     create_full_put_path on;
+    location /chunked/ {  # what passes through the filter has no length
+      alias @DIR@/http/;
+      ssi on;
+      ssi_types *;
+    }
+    location /moved/ {
+      rewrite ^/moved/(.*)$ /$1 redirect;
+    }
     location /private/ {
       auth_basic "private";
       auth_basic_user_file @DIR@/htpasswd;
@@ -59,7 +68,23 @@ allow_writeable_chroot=YES
 write_enable=YES
 max_per_ip=0
 pam_service_name=vsftpd
-xferlog_enable=NO
+xferlog_enable=YES
+vsftpd_log_file=@DIR@/ftp.log
+"""
+
+# The same once more, encrypted from the first byte.
+NGINX_TLS = NGINX.replace("@PORT@;", """@PORT@ ssl;
+    ssl_certificate @DIR@/localhost.pem;
+    ssl_certificate_key @DIR@/localhost.pem;""").replace("nginx.pid", "nginx_tls.pid")
+
+VSFTPD_TLS = VSFTPD + """
+ssl_enable=YES
+implicit_ssl=YES
+require_ssl_reuse=YES
+allow_anon_ssl=YES
+ssl_ciphers=HIGH
+rsa_cert_file=@DIR@/localhost.pem
+rsa_private_key_file=@DIR@/localhost.pem
 """
 
 PAM = """

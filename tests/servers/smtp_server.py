@@ -1,7 +1,8 @@
-"""smtp_server.py FOLDER USER PASSWORD: the mail side of with_servers, which says what it keeps.
+"""smtp_server.py FOLDER USER PASSWORD CERTIFICATE: the mail side of with_servers, which says what
+it keeps.
 
-Prints three ports, a line each: no login, AUTH LOGIN only, AUTH PLAIN only. Takes nothing but mail
-of a text and one attachment.
+Prints four ports, a line each: no login, AUTH LOGIN only, AUTH PLAIN only, and that encrypted.
+Takes nothing but mail of a text and one attachment.
 """
 
 import asyncio
@@ -10,6 +11,7 @@ import email.policy
 import email.utils
 import pathlib
 import shutil
+import ssl
 import sys
 
 from aiosmtpd.smtp import SMTP, AuthResult, LoginPassword
@@ -48,8 +50,10 @@ class Keeper:
         return "250 kept"
 
 
-async def serve(folder, user, password):
+async def serve(folder, user, password, certificate):
     keeper = Keeper(folder)
+    encryption = ssl.SSLContext(ssl.PROTOCOL_TLS_SERVER)
+    encryption.load_cert_chain(certificate)
 
     def check(server, session, envelope, mechanism, data):
         good = data == LoginPassword(user.encode(), password.encode())
@@ -61,8 +65,10 @@ async def serve(folder, user, password):
                             auth_required="PLAIN" not in refused or "LOGIN" not in refused)
 
     servers = []
-    for refused in (["LOGIN", "PLAIN"], ["PLAIN"], ["LOGIN"]):
-        server = await asyncio.get_running_loop().create_server(protocol(refused), "127.0.0.1", 0)
+    for refused, context in ((["LOGIN", "PLAIN"], None), (["PLAIN"], None), (["LOGIN"], None),
+                             (["LOGIN"], encryption)):
+        server = await asyncio.get_running_loop().create_server(protocol(refused), "127.0.0.1", 0,
+                                                                ssl=context)
         print(server.sockets[0].getsockname()[1], flush=True)
         servers.append(server)
     await asyncio.gather(*(server.serve_forever() for server in servers))

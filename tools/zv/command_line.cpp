@@ -2,9 +2,11 @@
 #include "command_line.h"
 
 #include <CLI/CLI.hpp>
+#include <cstdlib>
 #include <memory>
 
 #include "commands.h"
+#include "location_text.h"
 #include "zarvo.h"
 
 namespace tool {
@@ -46,6 +48,20 @@ class Command {
     return *this;
   }
 
+  Command& takes_seconds(const char* name, std::optional<double> Options::*value,
+                         const char* help) {
+    constexpr double most = INT_MAX / 1000;
+    app_->add_option_function<double>(
+            name, [value, options = options_](double seconds) { (*options).*value = seconds; },
+            help)
+        ->check([](const std::string& text) {
+          const double seconds = std::strtod(text.c_str(), nullptr);
+          return seconds >= 0 && seconds <= most ? std::string() : text + " is no time in seconds";
+        })
+        ->type_name("SECONDS");
+    return *this;
+  }
+
   Command& flag(const char* name, bool Options::*value, const char* help) {
     app_->add_flag(name, (*options_).*value, help);
     return *this;
@@ -71,13 +87,28 @@ void add_copy(Program& program) {
   add(program, "copy", "Copy one file between two locations", copy)
       .needs("FROM", &CopyOptions::from, "a location")
       .needs("TO", &CopyOptions::to, "another")
+      .takes_seconds("--timeout", &CopyOptions::timeout,
+                     "how long a server may be silent; without it 30, for mail 300; 0: for ever")
+      .takes_seconds("--max-time", &CopyOptions::max_time, "how long a try may take")
       .takes_number("--retries", &CopyOptions::retries, 100,
-                    "how often a failed download is tried again; without it 2")
+                    "how often to try again after a failure of the moment; without it 2")
+      .flag("--no-clobber", &CopyOptions::no_clobber, "fail where the destination exists")
+      .flag("--in-place", &CopyOptions::in_place, "write over the destination, not beside it")
+      .flag("--sync", &CopyOptions::sync, "wait until the new file is on the disk")
+      .takes("--user", &CopyOptions::user, "NAME", "log in at the server as this user")
+      .takes("--password-file", &CopyOptions::password_file, "FILE",
+             "with the password in this file's first line; - is standard input")
+      .takes("--ca", &CopyOptions::ca, "FILE",
+             "trust the certificates of this PEM file, not the system's")
       .flag("--quiet", &CopyOptions::quiet, "show no progress")
       .ends_with(
-          "A location is a path, file://, ftp://, http:// or, as a destination, smtp://:\n"
+          "A location is a path, file://, ftp://, http:// or, as a destination, smtp://;\n"
+          "ftps://, https:// and smtps:// are encrypted:\n"
           "  ftp://[user[:password]@]host[:port]/path\n"
           "  smtp://[sender[:password]@]host[:port]/recipient  mails the file\n"
+          "A folder as destination gets a file of the source's name. A local file is replaced "
+          "when\n"
+          "the new one is complete; a copy that fails or is interrupted leaves it as it was.\n"
           "The exit code is 3 when the source failed and 4 when the destination did.\n\n"
           "Examples:\n"
           "  zv copy http://example.com/data.bin data.bin\n"
@@ -190,7 +221,7 @@ int run_command_line(int argc, char** argv) {
   } catch (const CLI::Success& wanted) {  // help, or the version
     return program.app.exit(wanted);
   } catch (const CLI::ParseError& error) {
-    complain(std::string(error.what()) + "\nRun zv --help, or zv COMMAND --help, for more.");
+    complain(without_logins(error.what()) + "\nRun zv --help, or zv COMMAND --help, for more.");
     return wrong_usage;
   }
   return program.exit_code;

@@ -4,17 +4,27 @@
 #define ZV_TOOL_COMMANDS_H
 
 #include <climits>
+#include <optional>
 #include <string>
 
 namespace tool {
 
-// As a shell user expects them; a copy tells which side failed.
+// As a shell user expects them; a copy tells which side failed, and 128 and the signal that ended
+// it.
 enum ExitCode { done = 0, no = 1, wrong_usage = 2, source_failed = 3, destination_failed = 4 };
 
 struct CopyOptions {
   std::string from;
   std::string to;
+  std::string user;
+  std::string password_file;
+  std::string ca;
+  std::optional<double> timeout;   // seconds
+  std::optional<double> max_time;  // seconds
   int retries = 2;
+  bool no_clobber = false;
+  bool in_place = false;
+  bool sync = false;
   bool quiet = false;
 };
 int copy(const CopyOptions& options);
@@ -67,8 +77,9 @@ struct InfoOptions {
 };
 int info(const InfoOptions& options);
 
-// A message for a person, on standard error.
-void complain(const std::string& message);
+// A message for a person, on standard error; with the system's words for errno's number `error`,
+// unless that is 0.
+void complain(const std::string& message, int error = 0);
 
 }  // namespace tool
 

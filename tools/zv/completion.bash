@@ -25,10 +25,17 @@ _zv() {
             _zv_offer_files -d "$word"
             return
             ;;
-        --retries | --files | --dirs | --min | --max) return ;;
+        --password-file | --ca)
+            _zv_offer_files -f "$word"
+            return
+            ;;
+        --timeout | --max-time | --retries | --user | --files | --dirs | --min | --max) return ;;
     esac
     case $command in
-        copy) options+=" --retries --quiet" ;;
+        copy)
+            options+=" --timeout --max-time --retries --no-clobber --in-place --sync --user"
+            options+=" --password-file --ca --quiet"
+            ;;
         scan) options+=" --files --dirs --recursive --hidden --match-case --json" ;;
         path)
             if [ "$COMP_CWORD" -eq 2 ]; then

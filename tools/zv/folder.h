@@ -9,7 +9,7 @@
 
 namespace tool {
 
-// Says so when there is none.
+// Whether it can be looked into; says why not.
 bool is_folder(const std::string& path);
 
 // The entries of a folder, sorted by name.

@@ -36,7 +36,7 @@ std::string escaped(unsigned code_point) {
   return text;
 }
 
-// Appends a value behind those that are there.
+// Appends a value after those that are there.
 void append_value(std::string& json, std::string_view value) {
   json.append(json.size() > 1 ? ", " : "").append(value);
 }

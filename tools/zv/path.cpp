@@ -13,7 +13,9 @@ const char* base_of(const PathOptions& options) {
   return options.base.empty() ? nullptr : options.base.c_str();
 }
 
+// Where nothing is left of a path, it is the folder that one stands in.
 void print(const PathOptions& options, const char* path) {
+  if (*path == '\0') path = ".";
   std::puts(options.json ? json_string(path).c_str() : path);
 }
 
@@ -23,7 +25,13 @@ int path_normalize(const PathOptions& options) {
   PathText path;
   if (!path.assign(options.path)) return no;
   if (zv_normalize_path(path.data()) == 0) {
-    complain("cannot be normalised: " + options.path);
+    // What stands in front of a variable that is not set is kept.
+    complain(
+        "cannot normalise " + options.path +
+        (*path.c_str() != '\0'
+             ? ": no value for the variable after " + std::string(path.c_str())
+             : ": it climbs above its root, grows too long, or names a drive, a home folder or "
+               "a variable that is not there"));
     return no;
   }
   print(options, path.c_str());
@@ -35,7 +43,8 @@ int path_absolute(const PathOptions& options) {
   if (!path.assign(options.path)) return no;
   if (zv_ispath_relative(path.c_str()) != 0 &&
       zv_absolute(path.c_str(), base_of(options), path.data(), PathText::size()) == 0) {
-    complain("leads to no place: " + options.path);
+    complain("cannot make " + options.path +
+             " absolute: it climbs above the base's root or grows too long");
     return no;
   }
   print(options, path.c_str());
@@ -46,10 +55,10 @@ int path_relative(const PathOptions& options) {
   PathText path;
   if (!path.assign(options.path)) return no;
   if (zv_relative(path.c_str(), base_of(options), path.data(), PathText::size()) == 0) {
-    complain("has nothing in common with the base: " + options.path);
+    complain("cannot make " + options.path + " relative: it has no root in common with the base");
     return no;
   }
-  print(options, *path.c_str() == '\0' ? "." : path.c_str());
+  print(options, path.c_str());
   return done;
 }
 
@@ -70,7 +79,11 @@ int path_split(const PathOptions& options) {
 
 int path_locate(const PathOptions& options) {
   PathText path;
-  if (!path.assign(options.path) || zv_path_locate(path.data()) == 0) return no;
+  if (!path.assign(options.path)) return no;
+  if (zv_path_locate(path.data()) == 0) {
+    complain("no folder of PATH has " + options.path);
+    return no;
+  }
   print(options, path.c_str());
   return done;
 }

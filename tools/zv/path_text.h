@@ -10,7 +10,7 @@ namespace tool {
 
 class PathText {
  public:
-  // Says so and gives false when the path is longer than the library works with.
+  // Says so and gives false when the path is empty or longer than the library works with.
   bool assign(const std::string& path);
 
   char* data() { return text_; }

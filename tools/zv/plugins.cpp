@@ -1,10 +1,12 @@
 // zv plugins: which libraries of a folder serve an API, and why the others do not.
 #include <cstdio>
 #include <memory>
+#include <set>
 
 #include "commands.h"
 #include "folder.h"
 #include "json.h"
+#include "system.h"
 
 namespace tool {
 namespace {
@@ -24,7 +26,7 @@ std::string reason(int code, const PluginsOptions& options) {
     case ZV_PLUGIN_E_NOT_FOUND:
       return "not found";
     case ZV_PLUGIN_E_LOAD:
-      return "cannot be loaded";
+      return "cannot be loaded: " + loader_words();
     case ZV_PLUGIN_E_ENTRY:
       return "exports no zv_plugin";
     case ZV_PLUGIN_E_API:
@@ -53,6 +55,7 @@ struct Verdict {
 
 Verdict try_library(const PluginsOptions& options, const char* name) {
   int code = 0;
+  loader_words();  // what an earlier one left
   const PluginPtr plugin(zv_plugin_create(options.folder.c_str(), name, options.api.c_str(),
                                           options.oldest, options.newest, &code));
   if (plugin == nullptr) return {name, "rejected", reason(code, options)};
@@ -62,20 +65,22 @@ Verdict try_library(const PluginsOptions& options, const char* name) {
   return verdict;
 }
 
-// The library passes over img_ad.dll, a debug build, where img_a.dll lies beside it.
-const char* original_of(const char* name, const Listing& candidates) {
-  for (const char* const other : candidates.names()) {
-    std::string variant = other;
-    variant.insert(variant.rfind('.'), 1, 'd');
-    if (zv_stricmp(variant.c_str(), name) == 0) return other;
+// Which files the library would try, in its own words: asked for a range of versions that cannot
+// be, it reports each and runs none.
+std::set<std::string> names_to_try(const PluginsOptions& options, const std::string& base) {
+  const std::string head = "Testing library ";
+  const std::string tail = " for " + options.api + " API...";
+  zv_plugin_t** none = nullptr;
+  zv_putenv_private(base.c_str(), options.folder.c_str(), 0);
+  const std::string report =
+      messages_of([&] { zv_plugin_enumerate(&none, options.api.c_str(), 1, 0, 0); });
+  zv_free(none);
+  std::set<std::string> names;
+  for (size_t at = 0; (at = report.find(head, at)) != std::string::npos;) {
+    at += head.size();
+    names.insert(report.substr(at, report.find(tail, at) - at));
   }
-  return nullptr;
-}
-
-Verdict verdict_on(const PluginsOptions& options, const char* name, const Listing& candidates) {
-  const char* const original = original_of(name, candidates);
-  if (original == nullptr) return try_library(options, name);
-  return {name, "skipped", std::string("variant of ") + original};
+  return names;
 }
 
 void print_line(const Verdict& verdict) {
@@ -103,15 +108,20 @@ std::string as_json(const Verdict& verdict) {
 }  // namespace
 
 int plugins(const PluginsOptions& options) {
-  const std::string pattern = options.api.substr(0, options.api.find('.')) + "_*.dll";
+  const std::string base = options.api.substr(0, options.api.find('.'));
+  const std::string pattern = base + "_*.dll";
   dirsel_t selection = {};
   selection.file_patterns = pattern.c_str();
-  Listing candidates;
-  if (!is_folder(options.folder) || !candidates.scan(options.folder, &selection, false)) return no;
+  Listing files;
+  if (!is_folder(options.folder) || !files.scan(options.folder, &selection, false)) return no;
+  const std::set<std::string> to_try = names_to_try(options, base);
+  if (to_try.empty()) complain("no plugin of " + options.api + " to try in " + options.folder);
   int exit_code = no;
   std::vector<std::string> values;
-  for (const char* const name : candidates.names()) {
-    const Verdict verdict = verdict_on(options, name, candidates);
+  for (const char* const name : to_try.empty() ? std::span<char*>() : files.names()) {
+    const Verdict verdict = to_try.contains(name)
+                                ? try_library(options, name)
+                                : Verdict{name, "skipped", "a variant of another"};
     if (verdict.reason.empty()) exit_code = done;
     if (options.json)
       values.push_back(as_json(verdict));
@@ -119,7 +129,6 @@ int plugins(const PluginsOptions& options) {
       print_line(verdict);
   }
   if (options.json) std::puts(json_array(values).c_str());
-  if (candidates.names().empty()) complain("no " + pattern + " in " + options.folder);
   return exit_code;
 }
 

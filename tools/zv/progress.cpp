@@ -4,8 +4,6 @@
 #include <algorithm>
 #include <cstdio>
 
-#include "zarvo.h"
-
 namespace tool {
 namespace {
 
@@ -22,45 +20,44 @@ std::string bytes(double count) {
   return formatted("%.2f %s", count / 1e9, "GB");
 }
 
+std::string line(int64_t done, int64_t total, double seconds) {
+  const auto moved = static_cast<double>(done);
+  std::string text = bytes(moved);
+  if (total > 0) {
+    text += " of " + bytes(static_cast<double>(total)) + ", ";
+    text += formatted("%.0f %s", 100 * moved / static_cast<double>(total), "%");
+  }
+  if (seconds > 0) text += ", " + bytes(moved / seconds) + "/s";
+  return text + ", " + formatted("%.0f %s", seconds, "s");
+}
+
 }  // namespace
 
-Progress::Progress(std::string arriving, int64_t total)
-    : arriving_(std::move(arriving)), total_(total), watcher_([this] { watch(); }) {}
+Progress::Progress(zv_transfer_t* transfer) : transfer_(transfer) {
+  zv_transfer_watch(transfer, watch, this);
+}
 
 Progress::~Progress() {
-  {
-    const std::lock_guard lock(mutex_);
-    end_ = true;
-  }
-  ended_.notify_one();
-  watcher_.join();
+  zv_transfer_watch(transfer_, nullptr, nullptr);
+  if (shown_ > 0) std::fprintf(stderr, "\r%*s\r", static_cast<int>(shown_), "");
 }
 
-// A copy that is done at once shows nothing.
-void Progress::watch() {
-  using std::chrono::milliseconds;
-  size_t shown = 0;
-  std::unique_lock lock(mutex_);
-  for (milliseconds pause(500); !ended_.wait_for(lock, pause, [this] { return end_; });
-       pause = milliseconds(200)) {
-    const std::string text = line();
-    std::fprintf(stderr, "\r%-*s", static_cast<int>(shown), text.c_str());
-    std::fflush(stderr);
-    shown = std::max(shown, text.size());
-  }
-  if (shown > 0) std::fprintf(stderr, "\r%*s\r", static_cast<int>(shown), "");
+int Progress::watch(void* progress, int64_t done, int64_t total) {
+  static_cast<Progress*>(progress)->show(done, total);
+  return 0;
 }
 
-std::string Progress::line() const {
-  const std::chrono::duration<double> elapsed = std::chrono::steady_clock::now() - begin_;
-  const std::string seconds = formatted("%.0f %s", elapsed.count(), "s");
-  struct _stat64 status = {};
-  if (arriving_.empty() || zv_stat(arriving_.c_str(), &status) != 0)
-    return (total_ > 0 ? bytes(static_cast<double>(total_)) + " on their way, " : "") + seconds;
-  const auto arrived = static_cast<double>(status.st_size);
-  std::string text = bytes(arrived) + ", " + bytes(arrived / elapsed.count()) + "/s, " + seconds;
-  if (total_ > 0) text += formatted(", %.0f %s", 100 * arrived / static_cast<double>(total_), "%");
-  return text;
+// A copy that is done at once shows nothing. A count that begins again has its own speed.
+void Progress::show(int64_t done, int64_t total) {
+  const Clock::time_point now = Clock::now();
+  if (done < done_) begin_ = now;
+  done_ = done;
+  if (now < next_) return;
+  next_ = now + std::chrono::milliseconds(200);
+  const std::string text = line(done, total, std::chrono::duration<double>(now - begin_).count());
+  std::fprintf(stderr, "\r%-*s", static_cast<int>(shown_), text.c_str());
+  std::fflush(stderr);
+  shown_ = std::max(shown_, text.size());
 }
 
 }  // namespace tool

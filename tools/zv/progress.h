@@ -3,36 +3,32 @@
 #define ZV_TOOL_PROGRESS_H
 
 #include <chrono>
-#include <condition_variable>
 #include <cstdint>
-#include <mutex>
 #include <string>
-#include <thread>
+
+#include "zarvo.h"
 
 namespace tool {
 
-// Keeps one line of standard error up to date, from a thread of its own, until it goes out of
-// scope. What arrives can be read off the local file; what leaves cannot.
+// Keeps one line of standard error up to date until it goes out of scope.
 class Progress {
  public:
-  // `arriving`: the local file that the copy writes, or empty. `total`: its size in the end, 0 when
-  // nobody knows.
-  Progress(std::string arriving, int64_t total);
+  explicit Progress(zv_transfer_t* transfer);
   ~Progress();
   Progress(const Progress&) = delete;
   Progress& operator=(const Progress&) = delete;
 
  private:
-  void watch();
-  std::string line() const;
+  using Clock = std::chrono::steady_clock;
 
-  const std::string arriving_;
-  const int64_t total_;
-  const std::chrono::steady_clock::time_point begin_ = std::chrono::steady_clock::now();
-  std::mutex mutex_;
-  std::condition_variable ended_;
-  bool end_ = false;
-  std::thread watcher_;
+  static int watch(void* progress, int64_t done, int64_t total);
+  void show(int64_t done, int64_t total);
+
+  zv_transfer_t* const transfer_;
+  Clock::time_point begin_ = Clock::now();
+  Clock::time_point next_ = begin_ + std::chrono::milliseconds(500);
+  int64_t done_ = 0;
+  size_t shown_ = 0;
 };
 
 }  // namespace tool

@@ -1,10 +1,11 @@
 // zv rm: a folder and everything in it, after a question.
+#include <cerrno>
 #include <cstdio>
 
 #include "commands.h"
 #include "folder.h"
 #include "path_text.h"
-#include "terminal.h"
+#include "system.h"
 
 namespace tool {
 namespace {
@@ -42,8 +43,11 @@ int remove(const RemoveOptions& options) {
     return no;
   }
   if (!options.agreed && !person_agrees(folder)) return no;
+  errno = 0;
   if (zv_rmpath(folder.c_str()) != 0) return done;
-  complain("could not be removed, or not wholly: " + folder);
+  const int error = errno;
+  const char* const why = error == 0 ? ": the path of an entry has more than 319 characters" : "";
+  complain("cannot remove all of " + folder + why, error);
   return no;
 }
 

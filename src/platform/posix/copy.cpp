@@ -5,11 +5,9 @@
 
 namespace zv::platform {
 
-void copy_within(FILE* from, FILE* to) {
-  constexpr ssize_t at_once = 1 << 30;
-  // A piece that comes short is the last one, or the rest is nothing that the system copies.
-  while (::copy_file_range(::fileno(from), nullptr, ::fileno(to), nullptr, at_once, 0) == at_once) {
-  }
+size_t copy_within(FILE* from, FILE* to, size_t most) {
+  const ssize_t copied = ::copy_file_range(::fileno(from), nullptr, ::fileno(to), nullptr, most, 0);
+  return copied > 0 ? static_cast<size_t>(copied) : 0;
 }
 
 }  // namespace zv::platform

@@ -14,16 +14,16 @@ DIR* stream_of(intptr_t search) {
   return reinterpret_cast<DIR*>(search);
 }
 
-EntryKind kind_of(const dirent& found) {
+Kind kind_of(const dirent& found) {
   switch (found.d_type) {
     case DT_UNKNOWN:
-      return EntryKind::unknown;
+      return Kind::none;
     case DT_DIR:
-      return EntryKind::directory;
+      return Kind::folder;
     case DT_LNK:
-      return EntryKind::link;
+      return Kind::link;
     default:
-      return EntryKind::other;
+      return Kind::other;
   }
 }
 
@@ -61,11 +61,11 @@ void search_close(intptr_t search) {
   ::closedir(stream_of(search));
 }
 
-EntryKind entry_kind(const char* path) {
+Kind entry_kind(const char* path) {
   struct stat st;
-  if (::lstat(path, &st) != 0) return EntryKind::unknown;
-  if (S_ISDIR(st.st_mode)) return EntryKind::directory;
-  return S_ISLNK(st.st_mode) ? EntryKind::link : EntryKind::other;
+  if (::lstat(path, &st) != 0) return Kind::none;
+  if (S_ISDIR(st.st_mode)) return Kind::folder;
+  return S_ISLNK(st.st_mode) ? Kind::link : Kind::other;
 }
 
 }  // namespace zv::platform

@@ -28,7 +28,7 @@ bool long_path(const char* path, PathBuffer& out) {
   return out.assign(path);
 }
 
-// On Windows an empty variable cannot exist; here it names nothing.
+// An empty variable names nothing.
 const char* temp_folder() {
   for (const char* const name : {"TMP", "TEMP", "TMPDIR"}) {
     const char* const value = std::getenv(name);

@@ -16,6 +16,8 @@ namespace {
 
 using Header = ElfW(Ehdr);
 using Segment = ElfW(Phdr);
+using Section = ElfW(Shdr);
+using Dynamic = ElfW(Dyn);
 using Offset = ElfW(Off);
 
 // A library's file, looked at before the loader gets it.
@@ -30,8 +32,8 @@ class LibraryFile {
   LibraryFile(const LibraryFile&) = delete;
   LibraryFile& operator=(const LibraryFile&) = delete;
 
-  // dlopen() maps a file's segments without asking whether they lie in it: a library that was only
-  // copied half would end the process with SIGBUS. It would also wait for ever on a pipe.
+  // dlopen() believes what it maps: a library that was only copied half, or whose end is still
+  // zeros, would end the process. It would also wait for ever on a pipe.
   bool is_whole() {
     struct stat st;
     Header header;
@@ -40,11 +42,11 @@ class LibraryFile {
     if (front_size_ < 0 || !read(header, 0) || header.e_phentsize != sizeof(Segment)) return false;
     for (size_t i = 0; i < header.e_phnum; ++i) {
       Segment segment;
-      if (!read(segment, header.e_phoff + i * sizeof segment)) return false;
-      if (segment.p_type == PT_LOAD && !lies_within(segment, static_cast<Offset>(st.st_size)))
+      if (!read(segment, header.e_phoff + i * sizeof segment) ||
+          !is_filled(segment, static_cast<Offset>(st.st_size)))
         return false;
     }
-    return true;
+    return has_its_end(header);
   }
 
  private:
@@ -58,8 +60,25 @@ class LibraryFile {
     return ::pread(descriptor_, &record, sizeof record, static_cast<off_t>(offset)) == size;
   }
 
-  static bool lies_within(const Segment& segment, Offset size) {
-    return segment.p_offset <= size && segment.p_filesz <= size - segment.p_offset;
+  bool is_filled(const Segment& segment, Offset size) const {
+    Dynamic first;
+    switch (segment.p_type) {
+      case PT_LOAD:
+        return segment.p_offset <= size && segment.p_filesz <= size - segment.p_offset;
+      case PT_DYNAMIC:
+        return read(first, segment.p_offset) && first.d_tag != DT_NULL;
+      default:
+        return true;
+    }
+  }
+
+  // Linkers write the table of sections last, and only its first record is empty.
+  bool has_its_end(const Header& header) const {
+    Section last;
+    if (header.e_shoff == 0 || header.e_shnum == 0) return true;
+    return header.e_shentsize == sizeof last &&
+           read(last, header.e_shoff + (header.e_shnum - 1U) * sizeof last) &&
+           last.sh_type != SHT_NULL;
   }
 
   int descriptor_;

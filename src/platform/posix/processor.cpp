@@ -1,4 +1,5 @@
-// What the machine can do. Asking it traps under most hypervisors, so the answer is kept.
+// What the machine and the C library can do. Asking the processor traps under most hypervisors, so
+// the answer is kept.
 #if defined(__x86_64__)
 #include <cpuid.h>
 #endif
@@ -51,6 +52,10 @@ bool has_wide_vectors() {
     kept.store(answer, std::memory_order_relaxed);
   }
   return answer == yes;
+}
+
+bool has_fast_search() {
+  return true;
 }
 
 }  // namespace zv::platform

@@ -1,4 +1,4 @@
-// IPv4 stream sockets.
+// Stream sockets over IPv4.
 #include <netdb.h>
 #include <netinet/in.h>
 #include <netinet/tcp.h>
@@ -67,7 +67,7 @@ void network_stop() {}
 Socket socket_open() {
   const int opened = socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, IPPROTO_TCP);
   if (opened < 0) return no_socket;
-  // Without it a short line behind a long one waits for the peer's delayed acknowledgement.
+  // Without it a short line after a long one waits for the peer's delayed acknowledgement.
   const int on = 1;
   setsockopt(opened, IPPROTO_TCP, TCP_NODELAY, &on, sizeof on);
   return opened;

@@ -1,6 +1,8 @@
 // A folder of one's own for a short time.
 #include <stdlib.h>
+#include <sys/random.h>
 
+#include "frame/text_view.h"
 #include "platform/platform.h"
 
 namespace zv::platform {
@@ -14,9 +16,8 @@ bool make_private_folder(PathBuffer& path) {
   return made;
 }
 
-bool names_a_file(std::string_view name) {
-  return !name.empty() && name != "." && name != ".." &&
-         name.find_first_of("/\\") == std::string_view::npos;
+bool random_number(uint64_t& out) {
+  return ::getrandom(&out, sizeof out, 0) == sizeof out;
 }
 
 }  // namespace zv::platform

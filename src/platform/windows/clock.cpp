@@ -1,5 +1,6 @@
-// Local time.
+// Local time and time that passes.
 #include <time.h>
+#include <windows.h>
 
 #include "platform/platform.h"
 
@@ -13,6 +14,10 @@ bool local_time(struct tm& out, int& offset_minutes) {
   struct tm clock = out;
   offset_minutes = static_cast<int>((_mkgmtime64(&clock) - now) / 60);
   return true;
+}
+
+int64_t monotonic_ms() {
+  return static_cast<int64_t>(GetTickCount64());
 }
 
 }  // namespace zv::platform

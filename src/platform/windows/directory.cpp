@@ -24,7 +24,7 @@ Search& search_of(intptr_t search) {
 }
 
 // A reparse point that stands for another name is a link; any other is what its attributes say. One
-// that cannot be asked is not followed either.
+// that cannot be asked, or has no tag, as Wine shows links, is not followed either.
 bool is_link(const char* path) {
   constexpr DWORD name_surrogate = 0x20000000;
   WIN32_FIND_DATAA found;
@@ -32,20 +32,20 @@ bool is_link(const char* path) {
   if (handle == INVALID_HANDLE_VALUE) return true;
   FindClose(handle);
   return (found.dwFileAttributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0 &&
-         (found.dwReserved0 & name_surrogate) != 0;
+         (found.dwReserved0 == 0 || (found.dwReserved0 & name_surrogate) != 0);
 }
 
-EntryKind kind_of(const char* path, DWORD attributes) {
-  if ((attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0 && is_link(path)) return EntryKind::link;
-  return (attributes & FILE_ATTRIBUTE_DIRECTORY) != 0 ? EntryKind::directory : EntryKind::other;
+Kind kind_of(const char* path, DWORD attributes) {
+  if ((attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0 && is_link(path)) return Kind::link;
+  return (attributes & FILE_ATTRIBUTE_DIRECTORY) != 0 ? Kind::folder : Kind::other;
 }
 
-EntryKind kind_of_found(const Search& search) {
+Kind kind_of_found(const Search& search) {
   const DWORD attributes = search.found.attrib;
   TextBuffer<ZV_PATH_MAX + sizeof search.found.name> path;
   if ((attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0 &&
       (!path.append(search.folder.view()) || !path.append(search.found.name)))
-    return EntryKind::unknown;
+    return Kind::none;
   return kind_of(path.c_str(), attributes);
 }
 
@@ -56,9 +56,7 @@ Entry entry_of(Search& search) {
 
 bool begin(Search& search, const char* directory) {
   TextBuffer<ZV_PATH_MAX + 2> pattern;
-  if (!search.folder.append(directory)) return false;
-  if (!search.folder.empty() && search.folder.back() != '/' && !search.folder.append('/'))
-    return false;
+  if (!search.folder.append(directory) || !end_with_slash(search.folder)) return false;
   if (!pattern.append(search.folder.view()) || !pattern.append('*')) return false;
   search.handle = _findfirst64(pattern.c_str(), &search.found);
   return search.handle != -1;
@@ -91,9 +89,14 @@ void search_close(intptr_t search) {
   _findclose(done->handle);
 }
 
-EntryKind entry_kind(const char* path) {
+Kind entry_kind(const char* path) {
   const DWORD attributes = GetFileAttributesA(path);
-  return attributes != INVALID_FILE_ATTRIBUTES ? kind_of(path, attributes) : EntryKind::unknown;
+  return attributes != INVALID_FILE_ATTRIBUTES ? kind_of(path, attributes) : Kind::none;
+}
+
+// Every search tells it.
+Hidden entry_hidden(intptr_t search, const char*, const char*) {
+  return entry_of(search_of(search)).hidden;
 }
 
 }  // namespace zv::platform

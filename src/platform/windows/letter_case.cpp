@@ -8,20 +8,9 @@ namespace zv::platform {
 
 namespace {
 
-// What a case function makes of each byte in the "C" locale.
-constexpr ByteMap shifted(unsigned char first, unsigned char last, int by) {
-  ByteMap map{};
-  for (int byte = 0; byte < 256; ++byte)
-    map[static_cast<size_t>(byte)] = byte >= first && byte <= last ? byte + by : byte;
-  return map;
-}
-
-constexpr ByteMap plain_lower = shifted('A', 'Z', 'a' - 'A');
-constexpr ByteMap plain_upper = shifted('a', 'z', 'A' - 'a');
-
 // Most programs never leave the "C" locale, the one without a code page.
-const int32_t* map_of(int (*convert)(int), const ByteMap& plain, ByteMap& room) {
-  if (::___lc_codepage_func() == 0) return plain.data();
+const int32_t* map_of(int (*convert)(int), const ByteMap& ascii, ByteMap& room) {
+  if (::___lc_codepage_func() == 0) return ascii.data();
   for (int byte = 0; byte < 256; ++byte) room[static_cast<size_t>(byte)] = convert(byte);
   return room.data();
 }
@@ -29,11 +18,11 @@ const int32_t* map_of(int (*convert)(int), const ByteMap& plain, ByteMap& room) 
 }  // namespace
 
 const int32_t* lower_map(ByteMap& room) {
-  return map_of(::tolower, plain_lower, room);
+  return map_of(::tolower, ascii_lower, room);
 }
 
 const int32_t* upper_map(ByteMap& room) {
-  return map_of(::toupper, plain_upper, room);
+  return map_of(::toupper, ascii_upper, room);
 }
 
 int compare_without_case(const char* a, const char* b) {

@@ -1,4 +1,4 @@
-// IPv4 stream sockets: Winsock 2.
+// Stream sockets over IPv4: Winsock 2.
 #include <winsock2.h>
 
 #include <algorithm>
@@ -50,7 +50,7 @@ Socket socket_open() {
   const SOCKET opened = socket(AF_INET, SOCK_STREAM, IPPROTO_TCP);
   if (opened == INVALID_SOCKET) return no_socket;
   SetHandleInformation(reinterpret_cast<HANDLE>(opened), HANDLE_FLAG_INHERIT, 0);
-  // Without it a short line behind a long one waits for the peer's delayed acknowledgement.
+  // Without it a short line after a long one waits for the peer's delayed acknowledgement.
   const int on = 1;
   setsockopt(opened, IPPROTO_TCP, TCP_NODELAY, reinterpret_cast<const char*>(&on), sizeof on);
   return static_cast<Socket>(opened);

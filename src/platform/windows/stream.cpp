@@ -1,10 +1,12 @@
 // What C streams leave out: 64-bit offsets, identity, opening in other ways.
+#include <errno.h>
 #include <fcntl.h>
 #include <io.h>
 #include <sys/stat.h>
 #include <windows.h>
 
 #include <cstdio>
+#include <cstring>
 
 #include "platform/platform.h"
 
@@ -19,6 +21,15 @@ HANDLE handle_of(FILE* stream) {
 FILE* uninherited(FILE* stream) {
   if (stream != nullptr) SetHandleInformation(handle_of(stream), HANDLE_FLAG_INHERIT, 0);
   return stream;
+}
+
+// Wine opens a file of a path so long that no other call sees it there; Windows opens none.
+bool is_within_reach(const char* path) {
+  if (std::strlen(path) < MAX_PATH || GetFileAttributesA(path) != INVALID_FILE_ATTRIBUTES ||
+      GetLastError() == ERROR_FILE_NOT_FOUND)
+    return true;
+  errno = ENAMETOOLONG;
+  return false;
 }
 
 }  // namespace
@@ -40,10 +51,11 @@ FILE* open_to_read(const char* path) {
 }
 
 FILE* open_to_write(const char* path) {
-  return uninherited(std::fopen(path, "wb"));
+  return is_within_reach(path) ? uninherited(std::fopen(path, "wb")) : nullptr;
 }
 
 FILE* open_unemptied(const char* path) {
+  if (!is_within_reach(path)) return nullptr;
   const int descriptor =
       _open(path, _O_WRONLY | _O_CREAT | _O_BINARY | _O_NOINHERIT, _S_IREAD | _S_IWRITE);
   if (descriptor < 0) return nullptr;
@@ -63,10 +75,20 @@ bool look_at(FILE* stream, OpenFile& out) {
   out = {};
   if (GetFileType(handle) != FILE_TYPE_DISK) return true;
   if (GetFileInformationByHandle(handle, &found) == 0) return false;
-  out = {.has_content = (found.nFileSizeHigh | found.nFileSizeLow) != 0,
+  out = {.is_file = true,
+         .size = int64_t{found.nFileSizeHigh} << 32 | found.nFileSizeLow,
+         .bits = (found.dwFileAttributes & FILE_ATTRIBUTE_READONLY) != 0 ? 0444U : 0666U,
          .has_identity = true,
          .device = found.dwVolumeSerialNumber,
          .number = uint64_t{found.nFileIndexHigh} << 32 | found.nFileIndexLow};
+  return true;
+}
+
+int64_t read_some(FILE* stream, char* room, size_t size) {
+  return _read(_fileno(stream), room, static_cast<unsigned>(size));
+}
+
+bool wait_to_read(FILE*, int) {
   return true;
 }
 

@@ -5,9 +5,7 @@
 // It needs what windows.h declares.
 #include <sddl.h>
 
-#include <algorithm>
 #include <cstdio>
-#include <iterator>
 #include <memory>
 
 #include "platform/platform.h"
@@ -29,35 +27,11 @@ std::unique_ptr<void, FreeLocal> owner_only() {
 }
 
 bool append_random(PathBuffer& path) {
-  unsigned number = 0;
+  uint64_t number = 0;
   TextBuffer<24> name;
-  return rand_s(&number) == 0 && name.fill([number](char* room, size_t size) {
-    return std::snprintf(room, size, "zarvo-%08x", number) > 0;
+  return random_number(number) && name.fill([number](char* room, size_t size) {
+    return std::snprintf(room, size, "zarvo-%08x", static_cast<unsigned>(number)) > 0;
   }) && path.append(name.view());
-}
-
-bool begins_with(std::string_view name, std::string_view device) {
-  return name.size() >= device.size() &&
-         zv_strnicmp(name.data(), device.data(), device.size()) == 0;
-}
-
-// The superscript digits count, in Latin-1 and in UTF-8.
-bool is_port_number(std::string_view text) {
-  if (text.starts_with('\xC2')) text.remove_prefix(1);
-  return text.size() == 1 && ((text[0] >= '1' && text[0] <= '9') || text[0] == '\xB9' ||
-                              text[0] == '\xB2' || text[0] == '\xB3');
-}
-
-// Names that lead to a device, with any extension, in every folder.
-bool is_device(std::string_view name) {
-  constexpr std::string_view devices[] = {"con", "prn", "aux", "nul", "conin$", "conout$"};
-  std::string_view stem(name.data(), std::min(name.find('.'), name.size()));
-  while (stem.ends_with(' ')) stem.remove_suffix(1);
-  if (begins_with(stem, "com") || begins_with(stem, "lpt"))
-    return is_port_number({stem.data() + 3, stem.size() - 3});
-  return std::any_of(std::begin(devices), std::end(devices), [stem](std::string_view device) {
-    return stem.size() == device.size() && begins_with(stem, device);
-  });
 }
 
 }  // namespace
@@ -78,12 +52,12 @@ bool make_private_folder(PathBuffer& path) {
   return false;
 }
 
-bool names_a_file(std::string_view name) {
-  if (name.empty() || name.ends_with('.') || name.ends_with(' ') || is_device(name)) return false;
-  return std::none_of(name.begin(), name.end(), [](unsigned char ch) {
-    return ch < ' ' ||
-           std::string_view("\\/:*?\"<>|").find(static_cast<char>(ch)) != std::string_view::npos;
-  });
+bool random_number(uint64_t& out) {
+  unsigned low = 0;
+  unsigned high = 0;
+  if (rand_s(&low) != 0 || rand_s(&high) != 0) return false;
+  out = uint64_t{high} << 32 | low;
+  return true;
 }
 
 }  // namespace zv::platform

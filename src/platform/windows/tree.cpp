@@ -11,10 +11,19 @@ namespace {
 
 constexpr intptr_t any_folder = 0;
 
+// A name of dots and spaces alone is left out of a path, which leaves the folder above; a colon
+// asks for a stream, which may be a folder's own.
+bool names_an_entry(std::string_view path) {
+  if (path.size() > 1 && path[1] == ':') path.remove_prefix(2);
+  path.remove_prefix(path.rfind('/') + 1);  // npos + 1 is 0: the whole of it
+  return path.find_first_not_of(". ") != std::string_view::npos &&
+         path.find(':') == std::string_view::npos;
+}
+
 }  // namespace
 
 intptr_t folder_open(const char* path) {
-  return entry_kind(path) == EntryKind::directory ? any_folder : no_folder;
+  return names_an_entry(path) && entry_kind(path) == Kind::folder ? any_folder : no_folder;
 }
 
 intptr_t folder_open_below(intptr_t, const char*, const char* path) {

@@ -1,0 +1,16 @@
+# Cross build for another Linux processor with Debian's compiler for it, run under qemu:
+#   -DZARVO_PROCESSOR=aarch64, s390x (which stores the highest byte first) or riscv64
+set(CMAKE_TRY_COMPILE_PLATFORM_VARIABLES ZARVO_PROCESSOR)
+set(CMAKE_SYSTEM_NAME Linux)
+set(CMAKE_SYSTEM_PROCESSOR ${ZARVO_PROCESSOR})
+
+set(CMAKE_C_COMPILER ${ZARVO_PROCESSOR}-linux-gnu-gcc)
+set(CMAKE_CXX_COMPILER ${ZARVO_PROCESSOR}-linux-gnu-g++)
+
+set(CMAKE_FIND_ROOT_PATH /usr/${ZARVO_PROCESSOR}-linux-gnu)
+set(CMAKE_FIND_ROOT_PATH_MODE_PROGRAM NEVER)
+set(CMAKE_FIND_ROOT_PATH_MODE_LIBRARY ONLY)
+set(CMAKE_FIND_ROOT_PATH_MODE_INCLUDE ONLY)
+
+set(CMAKE_CROSSCOMPILING_EMULATOR
+  "qemu-${ZARVO_PROCESSOR}-static;-L;/usr/${ZARVO_PROCESSOR}-linux-gnu")

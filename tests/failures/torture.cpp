@@ -1,0 +1,138 @@
+// Runs tests again and again, each time with another call below the library failing. What a test
+// expects does not count here: a crash, a block or a handle that is lost, and a hang do.
+// `zarvo_torture PART` runs the tests whose name holds that part, and shows what each expected.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <array>
+#include <atomic>
+#include <cerrno>
+#include <chrono>
+#include <csignal>
+#include <cstdio>
+#include <cstdlib>
+#include <string>
+#include <thread>
+#include <tuple>
+#include <utility>
+
+#include "failures/failing_calls.h"
+#include "fixtures/peer.h"
+#include "zarvo.h"
+
+namespace {
+
+using namespace failing;
+
+// A test with more calls has as many of them fail, evenly spread; fewer where it takes its time,
+// and none where it mostly waits.
+constexpr int most_points = 60;
+constexpr int hang_s = 100;
+constexpr std::chrono::milliseconds patience(400);
+
+std::array<char, 300> point;  // what is being tried
+std::atomic<int> points = 0;
+int faults = 0;
+bool gave_up = false;
+
+struct Listener : testing::EmptyTestEventListener {
+  void OnTestPartResult(const testing::TestPartResult& result) override {
+    if (result.fatally_failed()) gave_up = true;
+  }
+};
+
+[[noreturn]] void die(const char* how) {
+  std::fprintf(stderr, "%s: %s\n", how, point.data());
+  std::_Exit(1);
+}
+
+void crashed(int) {
+  die("crash");
+}
+
+void watch() {
+  for (int seen = -1, idle = 0;; std::this_thread::sleep_for(std::chrono::seconds(1))) {
+    idle = points == seen ? idle + 1 : 0;
+    seen = points;
+    if (idle >= hang_s) die("hang");
+  }
+}
+
+// What a test that ended early leaves in the tables of the process.
+void clear_tables() {
+  zv_putenv_private(nullptr, nullptr, 0);
+  zv_pathmap_clear();
+}
+
+// Gives the number of calls met, and whether one failed.
+std::pair<int, bool> run_with(const Fault& fault, int skipped) {
+  ++points;
+  gave_up = false;
+  clear_tables();
+  const int blocks = blocks_in_use();
+  const int handles = scripted::open_handles();
+  Attempt attempt(fault, skipped);
+  Attempt::begin();
+  std::ignore = RUN_ALL_TESTS();
+  Attempt::end();
+  clear_tables();
+  const int kept = blocks_in_use() - blocks;
+  const int open = scripted::open_handles() - handles;
+  // A test that gave up leaves it all behind.
+  if (!gave_up && (kept != 0 || open != 0)) {
+    std::fprintf(stderr, "%d blocks and %d handles lost: %s, %s\n", kept, open, point.data(),
+                 std::string(attempt.failed()).c_str());
+    ++faults;
+  }
+  return {attempt.met(), !attempt.failed().empty()};
+}
+
+void torture(const std::string& test, const Fault& fault) {
+  const auto attempt_at = [&](int skipped) {
+    std::snprintf(point.data(), point.size(), "%s, %s call %d, error %d", test.c_str(),
+                  fault.call.data(), skipped, fault.error);
+    return run_with(fault, skipped);
+  };
+  GTEST_FLAG_SET(filter, test);
+  const auto begin = std::chrono::steady_clock::now();
+  const int calls = attempt_at(1 << 30).first;
+  const auto taken = std::chrono::steady_clock::now() - begin;
+  if (taken > 5 * patience) {
+    std::printf("%s takes too long for it\n", test.c_str());
+    return;
+  }
+  const int step = 1 + calls / std::clamp(static_cast<int>(patience / taken), 3, most_points);
+  for (int skipped = 0; attempt_at(skipped).second; skipped += step)
+    if (std::chrono::steady_clock::now() - begin > 10 * patience) return;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  testing::InitGoogleTest(&argc, argv);
+  testing::TestEventListeners& listeners = testing::UnitTest::GetInstance()->listeners();
+  const std::string wanted = argc > 1 ? argv[1] : "";
+  if (wanted.empty()) delete listeners.Release(listeners.default_result_printer());
+  delete listeners.Release(listeners.default_xml_generator());
+  listeners.Append(new Listener);
+  for (const int sign : {SIGSEGV, SIGABRT, SIGFPE}) std::signal(sign, crashed);
+  std::thread(watch).detach();
+
+  const scripted::Network network;
+  zv_dll_open(ZARVO_LIBRARY, 1);  // the plugins find it then
+  const testing::UnitTest& all = *testing::UnitTest::GetInstance();
+  for (int i = 0; i < all.total_test_suite_count(); ++i) {
+    const testing::TestSuite& suite = *all.GetTestSuite(i);
+    for (int j = 0; j < suite.total_test_count(); ++j) {
+      const std::string test = suite.name() + std::string(".") + suite.GetTestInfo(j)->name();
+      if (test.find(wanted) == test.npos) continue;
+      torture(test, {all_memory, ENOMEM});
+#ifndef _WIN32
+      torture(test, {all_calls, EIO});
+      torture(test, {all_calls, EINTR});
+#endif
+    }
+  }
+  std::printf("%d points, %d faults\n", points.load(), faults);
+  return faults == 0 ? 0 : 1;
+}
