@@ -38,15 +38,18 @@ class Installed:
         run(self.cc, "-std=c99", *WARNINGS, source, "-o", program, *words)
         return program
 
+    def compiler(self):
+        """What tells CMake the compiler, and the platform with it."""
+        return ["--toolchain", self.toolchain] if self.toolchain else \
+            [f"-DCMAKE_C_COMPILER={self.cc}"]
+
     def build_with_cmake(self, source, *definitions):
         """Builds a project that finds the package; gives its folder of programs."""
         build = self.root / source.name
-        toolchain = ["--toolchain", self.toolchain] if self.toolchain else \
-            [f"-DCMAKE_C_COMPILER={self.cc}"]
         place = [f"-DCMAKE_PREFIX_PATH={self.prefix}", f"-DCMAKE_FIND_ROOT_PATH={self.prefix}"] \
             if self.prefix else []
-        run("cmake", "--fresh", "-S", source, "-B", build, "-G", "Ninja", *place, *toolchain,
-            *definitions)
+        run("cmake", "--fresh", "-S", source, "-B", build, "-G", "Ninja", *place,
+            *self.compiler(), *definitions)
         run("cmake", "--build", build)
         return build / "bin"
 

@@ -48,7 +48,7 @@ class Package(unittest.TestCase):
         """The library's own tests and programs are none of an including program's targets."""
         build = self.root / "inside"
         run("cmake", "-S", args.source / "tests/package/consumer", "-B", build, "-G", "Ninja",
-            f"-DZARVO_TREE={args.source}", f"-DCMAKE_C_COMPILER={args.cc}")
+            f"-DZARVO_TREE={args.source}", *self.installed.compiler())
         targets = re.findall(r"^((?:zarvo|zv|gtest|test)\w*): phony$",
                              run("ninja", "-C", build, "-t", "targets"), flags=re.M)
         self.assertEqual(sorted({*targets} - {"zarvo_tls"}),
