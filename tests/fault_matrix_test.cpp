@@ -58,7 +58,6 @@ bool is_tried(const Dialogue& dialogue, size_t number, bool with_handle, Fault f
 }
 
 void check_matrix(bool with_handle) {
-  const Network network;
   const ScratchFolder folder;
   folder.make_file("file", "hello");
   for (const Dialogue& dialogue : dialogues()) {

@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "environment.h"
-#include "fixtures/dialogue_server.h"
+#include "fixtures/dialogues.h"
 #include "scratch_folder.h"
 #include "zarvo.h"
 

@@ -31,7 +31,6 @@ zv::Location location_at(unsigned port, std::string_view user, std::string_view 
 }
 
 std::string official_name() {
-  const Network network;
   zv::TextBuffer<256> name;
   EXPECT_TRUE(zv::platform::official_host_name(name));
   return name.c_str();

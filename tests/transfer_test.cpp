@@ -8,7 +8,7 @@
 #include <string>
 #include <thread>
 
-#include "fixtures/dialogue_server.h"
+#include "fixtures/dialogues.h"
 #include "scratch_folder.h"
 #include "zarvo.h"
 

@@ -528,7 +528,6 @@ Operation run_along(const scripted::Dialogue& dialogue) {
 }
 
 TEST(Failures, OfTheNetwork) {
-  const scripted::Network network;
   std::vector<Operation> all = {{"zv_copy between servers",
                                  0,
                                  relayed,

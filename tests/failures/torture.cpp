@@ -118,7 +118,6 @@ int main(int argc, char** argv) {
   for (const int sign : {SIGSEGV, SIGABRT, SIGFPE}) std::signal(sign, crashed);
   std::thread(watch).detach();
 
-  const scripted::Network network;
   zv_dll_open(ZARVO_LIBRARY, 1);  // the plugins find it then
   const testing::UnitTest& all = *testing::UnitTest::GetInstance();
   for (int i = 0; i < all.total_test_suite_count(); ++i) {
