@@ -19,7 +19,7 @@ namespace {
 
 constexpr size_t kib = 1024;
 
-// What tests/servers/with_servers tells; "" without it.
+// What scripts/servers/with_servers tells; "" without it.
 std::string told(const char* name) {
   const char* const value = std::getenv((std::string("ZARVO_TEST_") + name).c_str());
   return value != nullptr ? value : "";

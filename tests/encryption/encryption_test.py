@@ -11,14 +11,11 @@ import ssl
 import subprocess
 import sys
 import threading
-import time
 import unittest
 from pathlib import Path
 
 from certificates import Authority
-
-sys.path.append(str(Path(__file__).resolve().parents[1] / "programs"))
-from programs import as_windows, start  # noqa: E402  pylint: disable=wrong-import-position
+from programs import as_windows, start
 
 TEXT = b"encrypted\n" * 1000
 REPLY = b"HTTP/1.1 200 OK\r\nContent-Length: %d\r\n\r\n" % len(TEXT)
@@ -32,7 +29,7 @@ class Conversation:
         self.connection = connection
         self.arrived, self.leaving = ssl.MemoryBIO(), ssl.MemoryBIO()
         self.tls = context.wrap_bio(self.arrived, self.leaving, server_side=True)
-        self.records = None  # how many go out before everything stalls
+        self.records = -1  # how many go out before everything stalls
 
     def send(self):
         data = self.leaving.read()
@@ -40,52 +37,45 @@ class Conversation:
             size = 5 + int.from_bytes(data[3:5], "big")
             self.connection.sendall(data[:size])
             data = data[size:]
-            if self.records is not None:
-                self.records -= 1
+            self.records -= 1
 
     def until(self, step, *arguments):
-        """One step of the encryption, with all that it has to send and receive."""
+        """One step of the encryption, with all that it has to send, an alert too, and to receive."""
         while True:
             try:
-                result = step(*arguments)
-                self.send()
-                return result
+                return step(*arguments)
             except ssl.SSLWantReadError:
                 self.send()
                 data = self.connection.recv(65536)
-                if not data:
-                    raise ConnectionError from None
                 self.arrived.write(data)
-            except ssl.SSLError:
-                self.send()  # the alert
-                raise
+                if not data:
+                    self.arrived.write_eof()
+            finally:
+                self.send()
 
-    def request(self):
+    def request(self, end=b"\r\n\r\n"):
         text = b""
-        while b"\r\n\r\n" not in text:
-            text += self.until(self.tls.read, 65536)
+        while not text.endswith(end):
+            piece = self.until(self.tls.read, 65536)
+            if not piece:
+                raise ConnectionError
+            text += piece
         return text
 
     def write(self, data, piece=16384):
         for i in range(0, len(data), piece):
             self.until(self.tls.write, data[i:i + piece])
 
-    def finish(self):
-        with contextlib.suppress(ssl.SSLError, ConnectionError):
-            self.until(self.tls.unwrap)
+
+def cut(peer, reply=REPLY, sent=len(TEXT), piece=16384):
+    peer.until(peer.tls.do_handshake)
+    peer.request()
+    peer.write(reply + TEXT[:sent], piece)
 
 
 def good(peer, reply=REPLY, piece=16384):
-    peer.until(peer.tls.do_handshake)
-    peer.request()
-    peer.write(reply + TEXT, piece)
-    peer.finish()
-
-
-def cut(peer, reply=REPLY, sent=len(TEXT)):
-    peer.until(peer.tls.do_handshake)
-    peer.request()
-    peer.write(reply + TEXT[:sent])
+    cut(peer, reply, piece=piece)
+    peer.until(peer.tls.unwrap)
 
 
 def redirect(peer):
@@ -106,6 +96,16 @@ def closed(peer):
     peer.connection.recv(65536)
 
 
+def refuse(peer, refused):
+    """An FTP server without one of the commands."""
+    peer.until(peer.tls.do_handshake)
+    peer.write(b"220 here\r\n")
+    while True:
+        command = peer.request(b"\r\n")
+        code = 230 if command.startswith(b"USER") else 534 if command.startswith(refused) else 200
+        peer.write(b"%d so be it\r\n" % code)
+
+
 class Server:
     """Serves each client on a thread of its own until it is told to stop."""
 
@@ -118,7 +118,6 @@ class Server:
             self.context.minimum_version = self.context.maximum_version = version
         self.listener = socket.create_server(("127.0.0.1", 0))
         self.port = self.listener.getsockname()[1]
-        self.sessions = 0
         threading.Thread(target=self.serve, daemon=True).start()
 
     def serve(self):
@@ -131,9 +130,7 @@ class Server:
         connection.settimeout(20)
         connection.setsockopt(socket.IPPROTO_TCP, socket.TCP_NODELAY, 1)
         with connection, contextlib.suppress(OSError, ValueError):
-            peer = Conversation(connection, self.context)
-            self.behave(peer)
-            self.sessions += peer.tls.session_reused or 0
+            self.behave(Conversation(connection, self.context))
 
     def close(self):
         self.listener.shutdown(socket.SHUT_RDWR)
@@ -144,66 +141,59 @@ class OpensslServer:
     """One that asks for a second handshake once it has the request, as OpenSSL's own can."""
 
     def __init__(self, certificate):
-        with socket.create_server(("127.0.0.1", 0)) as probe:
-            self.port = probe.getsockname()[1]
         self.process = subprocess.Popen(
-            ["openssl", "s_server", "-accept", f"127.0.0.1:{self.port}", "-tls1_2", "-cert",
-             certificate], stdin=subprocess.PIPE, stdout=subprocess.PIPE, stderr=subprocess.STDOUT)
-        self.wait_for(b"ACCEPT")
+            ["openssl", "s_server", "-accept", "127.0.0.1:0", "-tls1_2", "-cert", certificate],
+            bufsize=0, stdin=subprocess.PIPE, stdout=subprocess.PIPE, stderr=subprocess.STDOUT)
+        self.port = int(next(line for line in self.process.stdout if b"ACCEPT" in line).split(b":")[-1])
         threading.Thread(target=self.converse, daemon=True).start()
-
-    def wait_for(self, text):
-        for line in self.process.stdout:
-            if text in line:
-                return
 
     def converse(self):
         with contextlib.suppress(OSError):
-            for _ in range(2):
-                self.wait_for(b"Connection: close")
-                self.process.stdin.write(b"r\n")
-                self.process.stdin.flush()
+            for line in self.process.stdout:
+                if b"Connection: close" in line:
+                    self.process.stdin.write(b"r\n")
 
     def close(self):
         self.process.kill()
-        self.process.communicate()
+        self.process.wait()
 
 
 CLOSED, ENCRYPTION, SILENCE, CANCELLED, REFUSED = 8, 20, 4, 7, 12
 TLS_1_1, TLS_1_2 = ssl.TLSVersion.TLSv1_1, ssl.TLSVersion.TLSv1_2
+WITH = f"{ENCRYPTION} encryption with localhost: "
 
 # What a certificate says, who is asked for, and what the client says of it: "" is a good end.
 CERTIFICATES = [
     ("good", "localhost", ""),
     ("good", "LocalHost", ""),
-    ("good", "127.0.0.1", "certificate of 127.0.0.1: issued for localhost"),
-    ("others", "localhost", "certificate of localhost: issued for example.test, b.test, 10.0.0.1"),
-    ("expired", "localhost", "certificate of localhost: expired on 2026-01-01"),
-    ("early", "localhost", "certificate of localhost: not valid before 2098-12-31"),
+    ("good", "127.0.0.1", "issued for localhost"),
+    ("others", "localhost", "issued for example.test, b.test, 10.0.0.1"),
+    ("expired", "localhost", "expired on 2021-01-01"),
+    ("early", "localhost", "not valid before 2098-12-31"),
     ("address", "127.0.0.1", ""),
-    ("address", "localhost", "certificate of localhost: issued for 127.0.0.1"),
-    ("written", "127.0.0.1", "certificate of 127.0.0.1: issued for 127.0.0.1"),
-    ("common", "localhost", "certificate of localhost: issued for no name"),
-    ("wild", "localhost", "certificate of localhost: issued for *.localhost"),
-    ("itself", "localhost", "certificate of localhost: signed by itself, and not trusted"),
+    ("address", "localhost", "issued for 127.0.0.1"),
+    ("written", "127.0.0.1", "issued for 127.0.0.1"),
+    ("common", "localhost", "issued for no name"),
+    ("wild", "localhost", "issued for *.localhost"),
+    ("itself", "localhost", "signed by itself, and not trusted"),
 ]
 
-# What a server does, with which version, and what the client says of it.
+# What a server does, what the client says of it, with which version, by which scheme.
 BEHAVIOURS = [
-    ("good", good, TLS_1_2, 0, ""),
-    ("a byte in each record", lambda peer: good(peer, piece=1), None, 0, ""),
-    ("no length", lambda peer: good(peer, NO_LENGTH), None, 0, ""),
-    ("no announced end, all of the length", cut, None, 0, ""),
-    ("no announced end, a part of the length", lambda peer: cut(peer, sent=100), None, CLOSED,
-     "GET /f: the connection was closed too early"),
-    ("no announced end, no length", lambda peer: cut(peer, NO_LENGTH), None, CLOSED,
-     "GET /f: the connection was closed without an announced end"),
-    ("in the clear", plain, None, ENCRYPTION,
-     "encryption with localhost: the answer is not encrypted"),
-    ("closed", closed, None, CLOSED, "encryption with localhost: the connection was closed"),
-    ("old", good, TLS_1_1, ENCRYPTION,
-     "encryption with localhost: it does not speak TLS 1.2 or later"),
-    ("a redirect out of it", redirect, None, REFUSED, "GET /f: 302 Found"),
+    ("good", good, "0 ", TLS_1_2),
+    ("a byte in each record", lambda peer: good(peer, piece=1), "0 "),
+    ("no length", lambda peer: good(peer, NO_LENGTH), "0 "),
+    ("no announced end, all of the length", cut, "0 "),
+    ("no announced end, a part of the length", lambda peer: cut(peer, sent=100),
+     f"{CLOSED} GET /f: the connection was closed too early"),
+    ("no announced end, no length", lambda peer: cut(peer, NO_LENGTH),
+     f"{CLOSED} GET /f: the connection was closed without an announced end"),
+    ("in the clear", plain, WITH + "the answer is not encrypted"),
+    ("closed", closed, f"{CLOSED} encryption with localhost: the connection was closed"),
+    ("old", good, WITH + "it does not speak TLS 1.2 or later", TLS_1_1),
+    ("a redirect out of it", redirect, f"{REFUSED} GET /f: 302 Found"),
+    ("no PBSZ", lambda peer: refuse(peer, b"PBSZ"), f"{ENCRYPTION} PBSZ 0: 534 so be it", None, "ftps"),
+    ("no PROT", lambda peer: refuse(peer, b"PROT"), f"{ENCRYPTION} PROT P: 534 so be it", None, "ftps"),
 ]
 
 
@@ -217,7 +207,7 @@ class Encryption(unittest.TestCase):
         cls.certificates = {
             "good": authority.issue("good", "DNS:localhost"),
             "others": authority.issue("others", "DNS:example.test, DNS:b.test, IP:10.0.0.1"),
-            "expired": authority.issue("expired", "DNS:localhost", end="20260101000000Z"),
+            "expired": authority.issue("expired", "DNS:localhost", end="20210101000000Z"),
             "early": authority.issue("early", "DNS:localhost", begin="20981231000000Z"),
             "address": authority.issue("address", "IP:127.0.0.1"),
             "written": authority.issue("written", "DNS:127.0.0.1"),
@@ -226,81 +216,86 @@ class Encryption(unittest.TestCase):
             "itself": authority.issue_itself("itself", "localhost"),
         }
 
-    def expect(self, server, expected, host="localhost", trusted=None, more=(),
-               scheme="https"):
+    def expect(self, server, expected, host="localhost", trusted=None, more=(), scheme="https",
+               fetch="zarvo_fetch", **environment):
         """Both runs of one handle end so; a file that was there stays but for a good end."""
+        shown = as_windows if emulator else str
         copy = folder / "copy"
         copy.write_bytes(b"old")
-        name, file = (as_windows(copy), as_windows(trusted or self.trusted)) if emulator else \
-            (copy, trusted or self.trusted)
         try:
-            code, output, messages = start(*emulator, program, f"{scheme}://{host}:{server.port}/f",
-                                           name, "" if trusted == "" else file, *more)
+            found = start(*emulator, programs / (fetch + suffix), f"{scheme}://{host}:{server.port}/f",
+                          shown(copy), trusted or shown(self.trusted) if trusted != "" else "", *more,
+                          env=environment)
         finally:
             server.close()
-        self.assertEqual((code, output, messages), (0, f"{expected}\n" * 2, ""))
-        self.assertEqual(copy.read_bytes() == TEXT, expected == "0 ")
-        self.assertIn(copy.read_bytes(), (TEXT, b"old"))
+        self.assertEqual(found, (0, f"{expected}\n" * 2, ""))
+        self.assertEqual(copy.read_bytes(), TEXT if expected == "0 " else b"old")
+
+    def good(self, *behave):
+        return Server(self.certificates["good"], *behave or [good])
 
     def test_certificates(self):
         for name, host, reason in CERTIFICATES:
             with self.subTest(name, host=host):
                 heard = []
                 server = Server(self.certificates[name], lambda peer: heard.append(good(peer)))
-                self.expect(server, f"{ENCRYPTION if reason else 0} {reason}", host)
+                end = f"{ENCRYPTION} certificate of {host}: {reason}" if reason else "0 "
+                self.expect(server, end, host)
                 self.assertEqual(bool(heard), not reason, "a request left")
-        with self.subTest("by itself, and trusted"):
-            self.expect(Server(self.certificates["itself"], good), "0 ",
-                        trusted=self.certificates["itself"])
-        with self.subTest("the system's certificates"):
-            self.expect(Server(self.certificates["good"], good),
-                        f"{ENCRYPTION} certificate of localhost: its issuer is not trusted",
-                        trusted="")
+
+    def test_trust(self):
+        """Without a file it goes by the system's certificates, which on Linux two variables name."""
+        itself, hashed = self.certificates["itself"], folder / "hashed"
+        self.expect(Server(itself, good), "0 ", trusted=as_windows(itself) if emulator else itself)
+        stranger = f"{ENCRYPTION} certificate of localhost: its issuer is not trusted"
+        self.expect(self.good(), stranger, trusted="")
+        if not emulator:
+            hashed.mkdir()
+            shutil.copy(self.trusted, hashed)
+            subprocess.run(["openssl", "rehash", hashed], check=True)
+            self.expect(self.good(), "0 ", trusted="", SSL_CERT_FILE=str(self.trusted))
+            self.expect(self.good(), "0 ", trusted="", SSL_CERT_DIR=str(hashed))
+            self.expect(Server(itself, good), f"{ENCRYPTION} certificate of localhost: signed by itself, "
+                        "and not trusted", SSL_CERT_FILE=str(itself))
 
     def test_behaviours(self):
-        for name, behave, version, cause, reason in BEHAVIOURS:
+        for name, behave, end, *more in BEHAVIOURS:
             with self.subTest(name):
-                self.expect(Server(self.certificates["good"], behave, version), f"{cause} {reason}")
-        with self.subTest("a second handshake"):
-            self.expect(OpensslServer(self.certificates["good"]),
-                        f"{ENCRYPTION} encryption with localhost: it wants a second handshake")
+                version, scheme = [*more, *(None, "https")[len(more):]]
+                self.expect(self.good(behave, version), end, scheme=scheme)
+        self.expect(OpensslServer(self.certificates["good"]), WITH + "it wants a second handshake")
 
     def test_redirect(self):
-        """From http:// into encryption, on the way back to http:// it would be refused."""
-        encrypted = Server(self.certificates["good"], good)
+        """From http:// into encryption; on the way back to http:// it would be refused."""
+        encrypted = self.good()
         to_it = b"HTTP/1.1 302 Found\r\nLocation: https://localhost:%d/f\r\n\r\n" % encrypted.port
-        clear = Server(self.certificates["good"], lambda peer: (
-            peer.connection.recv(65536), peer.connection.sendall(to_it)))
-        self.expect(clear, "0 ", scheme="http")
+        self.expect(self.good(lambda peer: (peer.connection.recv(65536),
+                                            peer.connection.sendall(to_it))), "0 ", scheme="http")
         encrypted.close()
 
     @unittest.skipIf(len(sys.argv) > 3, "Windows encrypts by itself")
-    def test_without_what_encrypts(self):
-        """The library alone, as its package installs it, does not even connect."""
+    def test_what_encrypts(self):
+        """A program may hold the library inside it, and may be linked to what encrypts. The library
+        alone, as its package installs it, does not even connect."""
+        self.expect(self.good(), "0 ", fetch="zarvo_fetch_static")
         alone = folder / "alone"
         alone.mkdir()
-        shutil.copy(program.parents[1] / "src/libzarvo.so.1", alone)
+        shutil.copy(programs.parent / "src/libzarvo.so.1", alone)
+        self.expect(self.good(), "0 ", fetch="zarvo_fetch_linked", LD_LIBRARY_PATH=str(alone))
         heard = []
-        server = Server(self.certificates["good"], heard.append)
-        found = start(program, f"https://localhost:{server.port}/f", folder / "copy", "",
-                      env={"LD_LIBRARY_PATH": str(alone)})
-        server.close()
-        self.assertEqual(found, (0, f"{ENCRYPTION} encryption needs libzarvo_tls.so.1, which is not "
-                                 "installed (package libzarvo-tls1)\n" * 2, ""))
+        self.expect(self.good(heard.append), f"{ENCRYPTION} encryption needs libzarvo_tls.so.1, which is "
+                    "not installed (package libzarvo-tls1)", LD_LIBRARY_PATH=str(alone))
         self.assertEqual(heard, [])
 
     def test_stalls(self):
         """A server that says nothing more after so many records of the handshake."""
-        for version, most in ((None, 1), (TLS_1_2, 5)):
-            for records in range(most + 1):
-                with self.subTest(version=version, records=records):
-                    for more, end in (((300,), f"{SILENCE} encryption with localhost: no reply "
-                                       "within 0.3 s"), ((20000, 300), f"{CANCELLED} cancelled")):
-                        self.expect(Server(self.certificates["good"],
-                                           lambda peer: stall(peer, records), version),
-                                    end, more=more)
+        silence = f"{SILENCE} encryption with localhost: no reply within 0.3 s"
+        for version, records in [(None, 0), (None, 1), *((TLS_1_2, i) for i in range(6))]:
+            with self.subTest(version=version, records=records):
+                for more, end in ((300,), silence), ((20000, 300), f"{CANCELLED} cancelled"):
+                    self.expect(self.good(lambda peer: stall(peer, records), version), end, more=more)
 
 
-program, folder = Path(sys.argv[1]), Path(sys.argv[2]).absolute()
-emulator = sys.argv[3:]
+programs, folder = Path(sys.argv[1]).absolute(), Path(sys.argv[2]).absolute()
+emulator, suffix = sys.argv[3:], ".exe" if len(sys.argv) > 3 else ""
 unittest.main(argv=["encryption_test.py", "-v"])

@@ -1,10 +1,10 @@
 #!/usr/bin/env python3
-"""Compiles and runs every example of the documents: README, the public headers' families and, made
-from those of C, the manual pages of section 3; and the command lines that zv's help and page show.
+"""Compiles and runs every example of README and the public headers, and runs the command lines that
+zv's help and manual page show.
 
 A block of C that has neither a main() nor a ZV_PLUGIN_EXPORT is the body of a main(). It must end
 with 0 and print what its comments `// prints TEXT` say, spaces and lines aside. Hosts of example.com
-and example.org stand for the servers of tests/servers/with_servers, which the test runs beside.
+and example.org stand for the servers of with_servers, which the test runs beside.
 
     documents_test.py SOURCE WORK_FOLDER LIBRARY ZV CC CXX [EMULATOR]
 """
@@ -19,37 +19,22 @@ from pathlib import Path
 import programs
 
 WARNINGS = ["-Wall", "-Wextra", "-Wpedantic", "-Wconversion", "-Wshadow", "-Werror"]
-FRAME = """#include <stdio.h>
-#include <stdlib.h>
-#include <string.h>
-#include <zarvo.h>
-
-int main(void) {
-  {
-%s
-  }
-  return 0;
-}
-"""
-CODEC = "int codec_v2(void); int codec_v2(void) { return 2; }\n"
+INCLUDES = "#include <stdio.h>\n#include <stdlib.h>\n#include <string.h>\n#include <zarvo.h>\n"
 FILES = {"notes.txt": "first\nsecond\n", "report.pdf": "%PDF", "data/input.txt": "12345",
          "album/a.png": "", "album/b.txt": "", "album/sub/c.jpg": "", "photo.img": "x",
          "old/album/d.png": "", "cmake": "", "plugins/readme": "", "codecs/readme": ""}
-COMMANDS = ["", "copy", "scan", "match", "path", "path normalize", "path absolute", "path relative",
+COMMANDS = ["copy", "scan", "match", "path", "path normalize", "path absolute", "path relative",
             "path split", "path locate", "rm", "plugins", "info"]
 URL = re.compile(r'(ftp|http|smtp)://([^/"]*@)?[a-z.]*example\.(?:com|org)/')
-given = os.environ
 
 
 def on_loopback(match):
     """A location on the test's own servers; who logs in does so as their user."""
-    scheme, login = match[1], match[2]
-    port = given.get({"ftp": "ZARVO_TEST_FTP_PORT", "http": "ZARVO_TEST_HTTP_PORT",
-                      "smtp": "ZARVO_TEST_SMTP_LOGIN_PORT" if login else "ZARVO_TEST_SMTP_PORT"}[scheme])
-    if port is None:
+    scheme, login = match[1], match[2] and "{USER}:{PASSWORD}@"
+    kind = "SMTP_LOGIN" if login and scheme == "smtp" else scheme.upper()
+    if kind + "_PORT" not in given:
         raise unittest.SkipTest(f"without root there is no {scheme} server")
-    login = login and f"{given['ZARVO_TEST_USER']}:{given['ZARVO_TEST_PASSWORD']}@"
-    return f"{scheme}://{login or ''}127.0.0.1:{port}/"
+    return f"{scheme}://{login or ''}127.0.0.1:{{{kind}_PORT}}/".format(**given)
 
 
 def run(*command):
@@ -57,7 +42,7 @@ def run(*command):
     windows = f"{programs.as_windows(library.parent.parent / 'bin')};{programs.as_windows(work)}"
     return programs.run(*command, cwd=work, env=dict(
         TMP=str(work), WINEPATH=windows, LD_LIBRARY_PATH=str(library.parent),
-        PATH=f"{work}:{given['PATH']}"))
+        PATH=f"{work}:{os.environ['PATH']}"))
 
 
 def build(text, program, *words):
@@ -65,8 +50,8 @@ def build(text, program, *words):
     layer = "zarvo.hpp" in text
     file = work / ("example.cpp" if layer else "example.c")
     file.write_text(text + "\n")
-    run(*([cxx, "-std=c++17", *(["-static"] if emulator else [])] if layer else [cc, "-std=c99"]),
-        *WARNINGS, "-I", source / "include", file, "-o", program, *words, library)
+    compiler = [cxx, "-std=c++17", *["-static"] * bool(emulator)] if layer else [cc, "-std=c99"]
+    run(*compiler, *WARNINGS, "-I", source / "include", file, "-o", program, *words, library)
     return program
 
 
@@ -75,70 +60,47 @@ class Documents(unittest.TestCase):
     def setUpClass(cls):
         shutil.rmtree(work, ignore_errors=True)
         programs.write_files(work, FILES)
-        build(CODEC, work / "codecs/fast.dll", "-shared", "-fPIC")
-        Path(given["ZARVO_TEST_HTTP_ROOT"], "data.bin").write_text("data")
+        build("int codec_v2(void); int codec_v2(void) { return 2; }", work / "codecs/fast.dll",
+              "-shared", "-fPIC")
         cls.families = header.read(source / "include/zarvo.h")[1]
-        cls.blocks = ["\n".join(lines) for family in cls.families for lines in family.examples]
-        layer = re.search(r"(?s)@code\{.cpp\}\n(.*) \* @endcode", (source / "include/zarvo.hpp").read_text())
-        cls.blocks.append(FRAME.replace(".h>\n\n", ".hpp>\n\n") % re.sub(r"(?m)^ \* ", "", layer[1]))
-        plugin, = (block for block in cls.blocks if "ZV_PLUGIN_EXPORT" in block)
-        cls.blocks.remove(plugin)
-        build(FRAME.split("int main")[0] + plugin, work / "plugins/img_sample.dll", "-shared", "-fPIC")
-        cls.help = {command: run(*emulator, zv, *command.split(), "--help") for command in COMMANDS}
-        cls.page = re.sub(r"\\\(aq", "'", (source / "tools/zv/zv.1").read_text().replace("\\-", "-"))
+        cls.plugin, = (text for family in cls.families for text in map("\n".join, family.examples)
+                       if "ZV_PLUGIN_EXPORT" in text)
+        build(INCLUDES + cls.plugin, work / "plugins/img_sample.dll", "-shared", "-fPIC")
+        Path(given["HTTP_ROOT"], "data.bin").write_text("data")
 
-    def check(self, block):
-        text = URL.sub(on_loopback, block)
-        whole = re.search(r"\bint main\(", text)
-        printed = run(*emulator, build(text if whole else FRAME % text, work / "example.exe"))
-        expected = re.findall(r"// prints (.*)", block)
-        if expected:
-            self.assertEqual(printed.split(), " ".join(expected).split(), printed)
-
-    def check_command_lines(self, text):
-        """Each as a shell runs it."""
-        lines = re.findall(r"(?m)^ *(zv .*)$", text)
-        self.assertTrue(lines)
-        for line in lines:
-            with self.subTest(line):
-                run("sh", "-ec", f"zv() {{ {shlex.join([*emulator, str(zv)])} \"$@\"; }}\n"
-                    + URL.sub(on_loopback, line))
-
-    def test_help_and_page_of_the_tool(self):
-        for command in COMMANDS[1:]:
-            with self.subTest(command):
-                self.check_command_lines(re.split(r"Examples?:\n", self.help[command])[1])
-        self.check_command_lines(re.search(r"(?s)\.SH EXAMPLES\n\.EX\n(.*)\.EE", self.page)[1])
-        option = r"--[a-z-]+"
-        self.assertEqual(set(re.findall(option, re.sub(r"\\f.", "", self.page))),
-                         set(re.findall(option, "".join(self.help.values()))))
-        for command in COMMANDS:
-            self.assertIn(command.split(" ")[-1], self.page)
-
-    def test_readme_and_families(self):
-        blocks = re.findall(r"```c(?:pp)?\n(.*?)```", (source / "README.md").read_text(), flags=re.S)
-        self.assertTrue(blocks)
+    def test_examples(self):
         self.assertEqual([family.name for family in self.families if not family.examples], [])
-        for block in blocks + self.blocks:
+        blocks = ["\n".join(lines) for family in self.families for lines in family.examples]
+        blocks.remove(self.plugin)
+        layer = re.search(r"(?s)@code\{.cpp\}\n(.*) \* @endcode", (source / "include/zarvo.hpp").read_text())
+        blocks.append("// zarvo.hpp\n" + re.sub(r"(?m)^ \* ", "", layer[1]))
+        readme = re.findall(r"```c(?:pp)?\n(.*?)```", (source / "README.md").read_text(), flags=re.S)
+        self.assertTrue(readme)
+        for block in readme + blocks:
             with self.subTest(block=block):
-                self.check(block)
+                text = URL.sub(on_loopback, block)
+                if "int main(" not in text:
+                    includes = INCLUDES + "#include <zarvo.hpp>\n" * ("zarvo.hpp" in text)
+                    text = f"{includes}int main(void) {{\n{{\n{text}\n}}\nreturn 0;\n}}"
+                printed = run(*emulator, build(text, work / "example.exe"))
+                expected = re.findall(r"// prints (.*)", block)
+                self.assertEqual(printed.split() if expected else [], " ".join(expected).split())
 
-    @unittest.skipUnless(shutil.which("groff"), "no groff here")
-    def test_manual_pages_show_them_unchanged(self):
-        pages = work / "man3"
-        run(sys.executable, source / "docs/man_pages.py", source / "include/zarvo.h", "1.0.0", pages)
-        shown_by = "groff -ww -t -man -Tutf8 -P-cbou -rLL=200n 2>&1"
-        self.assertNotIn("warning", run("sh", "-c", f"cat {source / 'tools/zv/zv.1'} | {shown_by}"))
-        for family in self.families:
-            page = pages / f"zarvo_{family.name}.3.gz"
-            shown = run("sh", "-c", f"zcat {page} | {shown_by}")
-            self.assertNotIn("warning", shown)
-            for lines in family.examples:
-                self.assertIn("\n".join(lines), re.sub(r"(?m)^ {7}", "", shown))
+    def test_command_lines(self):
+        """Each as a shell runs it."""
+        page = re.sub(r"\\\(aq", "'", (source / "tools/zv/zv.1").read_text().replace("\\-", "-"))
+        shown = {command: re.split("Examples?:\n", run(*emulator, zv, *command.split(), "--help"))[1]
+                 for command in COMMANDS}
+        for text in *shown.values(), re.search(r"(?s)\.SH EXAMPLES\n\.EX\n(.*)\.EE", page)[1]:
+            for line in re.findall(r"(?m)^ *(zv .*)$", text) or self.fail(text):
+                with self.subTest(line):
+                    run("sh", "-ec", f"zv() {{ {shlex.join([*emulator, str(zv)])} \"$@\"; }}\n"
+                        + URL.sub(on_loopback, line))
 
 
 source, work, library, zv = (Path(word).absolute() for word in sys.argv[1:5])
 cc, cxx, *emulator = sys.argv[5:]
+given = {name.removeprefix("ZARVO_TEST_"): value for name, value in os.environ.items()}
 sys.path.insert(0, str(source / "docs"))
 import header  # noqa: E402  pylint: disable=wrong-import-position
 

@@ -10,7 +10,7 @@ def start(*command, cwd=None, env=None):
     with tempfile.TemporaryFile() as output, tempfile.TemporaryFile() as messages:
         done = subprocess.run([str(word) for word in command], stdin=subprocess.DEVNULL,
                               stdout=output, stderr=messages, cwd=cwd, timeout=200, check=False,
-                              env=dict(os.environ, LC_ALL="C.UTF-8", **env or {}))
+                              env={**os.environ, "LC_ALL": "C.UTF-8", **(env or {})})
         texts = []
         for file in (output, messages):
             file.seek(0)

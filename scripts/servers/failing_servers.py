@@ -7,10 +7,11 @@ import time
 
 class Server:
     """Breaks its first connections off; then `talk` has each, with its lines."""
+    location = "http://{}/x"
 
     def __init__(self, broken=0):
         self.listener = socket.create_server(("127.0.0.1", 0))
-        self.address = "127.0.0.1:%d" % self.listener.getsockname()[1]
+        self.url = self.location.format("127.0.0.1:%d" % self.listener.getsockname()[1])
         self.broken = broken
         self.connections = 0
         threading.Thread(target=self.serve, daemon=True).start()
@@ -33,7 +34,6 @@ class HttpServer(Server):
     def __init__(self, broken=0, pause=0.0, status=b"200 OK"):
         self.pause, self.status = pause, status
         super().__init__(broken)
-        self.url = f"http://{self.address}/x"
 
     def talk(self, client, lines):
         self.head = b"".join(iter(lines.readline, b"\r\n"))
@@ -53,6 +53,7 @@ class HttpServer(Server):
 class MailServer(Server):
     """Is gone once it has a message."""
     messages = 0
+    location = "smtp://{}"
 
     def talk(self, client, lines):
         client.sendall(b"220 here\r\n")
