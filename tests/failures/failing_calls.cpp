@@ -1,125 +1,212 @@
-// What decides whether a call fails, and the calls that fail on both platforms.
+// What decides whether a call fails, and the calls in place of others.
 #include "failures/failing_calls.h"
 
 #include <pthread.h>
 
 #include <atomic>
 #include <cerrno>
+#include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 #include <mutex>
+
+#ifndef _WIN32
+#include <dirent.h>
+#include <dlfcn.h>
+#include <fcntl.h>
+#include <netdb.h>
+#include <poll.h>
+#include <pwd.h>
+#include <sys/random.h>
+#include <sys/stat.h>
+#include <sys/xattr.h>
+#include <unistd.h>
+
+#include <ctime>
+#endif
 
 namespace failing {
 
 namespace {
 
+constexpr int by_name = 0;  // only where it is named
+constexpr int memory = 1;
+constexpr int system = 2;
+
 std::mutex mutex;  // a test may call the library on many threads
-Attempt* attempt = nullptr;
-bool in_scope = false;
-Fault current;
-int left = 0;
-int calls = 0;
-std::string_view failure;
 std::atomic<int> blocks = 0;
 
+bool is_tested(std::string_view call) {
+  const Attempt* const attempt = Attempt::current;
+  return attempt != nullptr && attempt->in_scope && attempt->call == call;
+}
+
+// Whether the call, which belongs to those groups, fails now; errno is set then.
+bool fails(std::string_view call, int groups) {
+  const std::lock_guard<std::mutex> lock(mutex);
+  if (!is_tested(call) && !((groups & memory) != 0 && is_tested(all_memory)) &&
+      !((groups & system) != 0 && is_tested(all_calls)))
+    return false;
+  Attempt& attempt = *Attempt::current;
+  ++attempt.met;
+  if (!attempt.failed.empty() || attempt.left-- > 0) return false;
+  attempt.failed = call;
+  if (attempt.error == disturbed) {
+    attempt.in_scope = false;
+    attempt.meanwhile();
+    attempt.in_scope = true;
+    return false;
+  }
+  if (attempt.error != shortened) errno = attempt.error;
+  return true;
+}
+
 }  // namespace
-
-Attempt::Attempt(const Fault& fault, int skipped) {
-  current = fault;
-  left = skipped;
-  calls = 0;
-  failure = {};
-  attempt = this;
-}
-
-Attempt::~Attempt() {
-  attempt = nullptr;
-}
-
-std::string_view Attempt::failed() const {
-  return failure;
-}
-
-int Attempt::met() const {
-  return calls;
-}
-
-void Attempt::begin() {
-  in_scope = true;
-}
-
-void Attempt::end() {
-  in_scope = false;
-}
 
 int blocks_in_use() {
   return blocks;
 }
 
-bool is_tested(std::string_view call) {
-  return attempt != nullptr && in_scope && current.call == call;
-}
-
-bool fails(std::string_view call, Kind kind) {
-  const std::lock_guard<std::mutex> lock(mutex);
-  const bool is_memory = kind == Kind::allocation || kind == Kind::system_with_memory;
-  const bool is_system = kind == Kind::system || kind == Kind::system_with_memory;
-  if (!is_tested(call) && !(is_memory && is_tested(all_memory)) &&
-      !(is_system && is_tested(all_calls)))
-    return false;
-  ++calls;
-  if (!failure.empty() || left-- > 0) return false;
-  failure = call;
-  if (current.error == disturbed) {
-    in_scope = false;
-    attempt->meanwhile();
-    in_scope = true;
-    return false;
-  }
-  if (current.error != shortened) errno = current.error;
-  return true;
-}
-
-bool is_shortened() {
-  return current.error == shortened;
-}
-
-}  // namespace failing
-
 extern "C" {
 
-using failing::fails;
-using failing::Kind;
-
 void* failing_malloc(size_t size) {
-  void* const block = fails("malloc", Kind::allocation) ? nullptr : malloc(size);
-  failing::blocks += block != nullptr;
+  void* const block = fails("malloc", memory) ? nullptr : malloc(size);
+  blocks += block != nullptr;
   return block;
 }
 
 void* failing_calloc(size_t count, size_t size) {
-  void* const block = fails("calloc", Kind::allocation) ? nullptr : calloc(count, size);
-  failing::blocks += block != nullptr;
+  void* const block = fails("calloc", memory) ? nullptr : calloc(count, size);
+  blocks += block != nullptr;
   return block;
 }
 
 void* failing_realloc(void* block, size_t size) {
-  void* const moved = fails("realloc", Kind::allocation) ? nullptr : realloc(block, size);
-  failing::blocks += block == nullptr && moved != nullptr;
+  void* const moved = fails("realloc", memory) ? nullptr : realloc(block, size);
+  blocks += block == nullptr && moved != nullptr;
   return moved;
 }
 
 void failing_free(void* block) {
-  failing::blocks -= block != nullptr;
+  blocks -= block != nullptr;
   free(block);
 }
 
-FILE* failing_fopen(const char* path, const char* mode) {
-  return fails("fopen", Kind::system_with_memory) ? nullptr : fopen(path, mode);
+// The others take and give numbers and pointers, which every processor hands on alike as words; the
+// words after a call's last argument are nobody's.
+using Word = intptr_t;
+#define ZV_WORDS Word a, Word b, Word c, Word d, Word e, Word f, Word g
+#define ZV_CALL(name) \
+  reinterpret_cast<Word (*)(ZV_WORDS)>(reinterpret_cast<void*>(&::name))(a, b, c, d, e, f, g)
+#define ZV_FAILING(name, groups, failure)                    \
+  Word failing_##name(ZV_WORDS) {                            \
+    return fails(#name, groups) ? (failure) : ZV_CALL(name); \
+  }
+
+ZV_FAILING(pthread_mutex_lock, by_name, ENOMEM)  // it can only fail when it is the first
+ZV_FAILING(fopen, memory | system, 0)
+
+// Those of the system. Linux alone: on Windows the library calls them through its import table.
+#ifndef _WIN32
+ZV_FAILING(fdopen, memory | system, 0)
+ZV_FAILING(opendir, memory | system, 0)
+ZV_FAILING(fdopendir, memory | system, 0)
+ZV_FAILING(dlopen, memory | system, 0)
+ZV_FAILING(getaddrinfo, memory | system, EAI_MEMORY)
+ZV_FAILING(getpwuid_r, system, errno)
+
+#define ZV_GIVING_NOTHING(X) X(dlsym) X(getcwd) X(localtime_r) X(mkdtemp) X(readdir)
+// clang-format off
+#define ZV_GIVING_MINUS_ONE(X) \
+  X(access) X(faccessat) X(fchmod) X(fchown) X(fgetxattr) X(fremovexattr) X(fseeko) X(fstat) \
+  X(fstatat) X(fsync) X(ftello) X(ftruncate) X(gethostname) X(getrandom) X(getsockopt) \
+  X(getxattr) X(lstat) X(mkdir) X(open) X(openat) X(poll) X(read) X(readlinkat) X(remove) \
+  X(removexattr) X(renameat) X(rmdir) X(setsockopt) X(setxattr) X(socket) X(stat) X(statx) \
+  X(syscall) X(unlinkat)
+// clang-format on
+#define ZV_NOTHING(name) ZV_FAILING(name, system, 0)
+#define ZV_MINUS_ONE(name) ZV_FAILING(name, system, -1)
+ZV_GIVING_NOTHING(ZV_NOTHING)
+ZV_GIVING_MINUS_ONE(ZV_MINUS_ONE)
+
+static Word told(Word result, int error) {
+  errno = error;
+  return result;
 }
 
-// Only where it is named: it can only fail when it is the first.
-int failing_pthread_mutex_lock(pthread_mutex_t* mutex) {
-  return fails("pthread_mutex_lock", Kind::only_by_name) ? ENOMEM : pthread_mutex_lock(mutex);
+// A call that does what it is for even when it fails.
+#define ZV_FAILING_AFTER(name)                \
+  Word failing_##name(ZV_WORDS) {             \
+    const bool failed = fails(#name, system); \
+    const int error = errno;                  \
+    const Word result = ZV_CALL(name);        \
+    return failed ? told(-1, error) : result; \
+  }
+ZV_FAILING_AFTER(close)
+ZV_FAILING_AFTER(closedir)
+ZV_FAILING_AFTER(fclose)
+
+// A connect that a signal interrupts goes on by itself. A wait for it only happens then.
+int failing_connect(int fd, const struct sockaddr* address, socklen_t size) {
+  const bool failed = fails("connect", system);
+  if (failed && errno != EINTR) return -1;
+  if (!failed && !is_tested("poll")) return connect(fd, address, size);
+  const int flags = fcntl(fd, F_GETFL);
+  fcntl(fd, F_SETFL, flags | O_NONBLOCK);
+  connect(fd, address, size);
+  fcntl(fd, F_SETFL, flags);
+  return static_cast<int>(told(-1, EINTR));
 }
+
+// The ways of taking a free name, each of which is only gone once the one before it failed.
+Word failing_renameat2(ZV_WORDS) {
+  if (is_tested("linkat") || is_tested("renameat")) return told(-1, EINVAL);
+  return fails("renameat2", system) ? -1 : ZV_CALL(renameat2);
 }
+
+Word failing_linkat(ZV_WORDS) {
+  if (is_tested("renameat")) return told(-1, EPERM);
+  return fails("linkat", system) ? -1 : ZV_CALL(linkat);
+}
+
+// A connection that was reset stays so.
+static Word lost(Word fd) {
+  const int error = errno;
+  if (error == ECONNRESET) shutdown(static_cast<int>(fd), SHUT_RDWR);
+  return told(-1, error);
+}
+
+// A call that moves bytes, or `less` of them when that is all it is to do.
+#define ZV_MOVING(name, size, less, failure)                            \
+  Word failing_##name(ZV_WORDS) {                                       \
+    const bool failed = fails(#name, system);                           \
+    if (failed && Attempt::current->error != shortened) return failure; \
+    if (failed) size = less;                                            \
+    return ZV_CALL(name);                                               \
+  }
+ZV_MOVING(send, c, (c + 1) / 2, lost(a))
+ZV_MOVING(recv, c, 1, lost(a))
+ZV_MOVING(pread, c, (c + 1) / 2, -1)
+ZV_MOVING(copy_file_range, e, 1000, -1)
+
+// Streams move half before they fail, and keep their error mark.
+static FILE* broken_stream = nullptr;
+
+size_t failing_fread(void* room, size_t size, size_t count, FILE* stream) {
+  const bool failed = fails("fread", system);
+  broken_stream = failed ? stream : nullptr;
+  return fread(room, size, failed ? count / 2 : count, stream);
+}
+
+int failing_ferror(FILE* stream) {
+  return stream == broken_stream || ferror(stream) != 0;
+}
+
+size_t failing_fwrite(const void* data, size_t size, size_t count, FILE* stream) {
+  const bool failed = count != 0 && fails("fwrite", system);
+  return fwrite(data, size, failed ? count / 2 : count, stream);
+}
+#endif
+}
+
+}  // namespace failing

@@ -8,65 +8,44 @@
 
 namespace failing {
 
-// What happens to one call.
-struct Fault {
-  std::string_view call;  // its name, or one of those below
-  int error;              // for errno, or one of those below
-};
-
 inline constexpr std::string_view all_memory = "memory";  // every call that needs some
 inline constexpr std::string_view all_calls = "system";   // every call of the system
 inline constexpr int shortened = -1;  // the call moves half of its bytes, and that is no error
-inline constexpr int disturbed =
-    -2;  // Attempt::meanwhile runs before the call, which then succeeds
+inline constexpr int disturbed = -2;  // `meanwhile` runs before the call, which then succeeds
 
 // During its life one call fails: the first, or the one after `skipped` others. There is one at a
 // time.
-class Attempt {
- public:
-  Attempt(const Fault& fault, int skipped);
-  ~Attempt();
+struct Attempt {
+  // The call's name, or one of those above; and a number for errno, or one of those above.
+  Attempt(std::string_view its_call, int its_error, int skipped)
+      : call(its_call), error(its_error), left(skipped) {
+    current = this;
+  }
+  ~Attempt() { current = nullptr; }
   Attempt(const Attempt&) = delete;
   Attempt& operator=(const Attempt&) = delete;
 
-  // Runs what is tested with nothing failing but in there.
+  // Runs what is tested: calls fail in there alone.
   template <class Call>
-  auto operator()(Call call) {
-    const Scope scope;
-    return call();
+  auto operator()(Call tested) {
+    in_scope = true;
+    const auto result = tested();
+    in_scope = false;
+    return result;
   }
 
-  // From here on calls may fail, and from there on not.
-  static void begin();
-  static void end();
-
+  inline static Attempt* current = nullptr;
+  const std::string_view call;
+  const int error;
+  int left;
+  bool in_scope = false;
   std::function<void()> meanwhile = [] {};  // what another process does
-
-  std::string_view failed() const;  // the call that failed; "" as long as none did
-  int met() const;                  // calls that could have failed, the failed one included
-
- private:
-  struct Scope {
-    Scope() { begin(); }
-    ~Scope() { end(); }
-  };
+  std::string_view failed;                  // the call that failed; "" as long as none did
+  int met = 0;                              // calls that could have failed, the failed one included
 };
 
 // Blocks that the library allocated and nobody has freed.
 int blocks_in_use();
-
-// ---- What the functions in place of others ask ----
-
-enum class Kind { allocation, system_with_memory, system, only_by_name };
-
-// Whether the call fails now; errno is set then.
-bool fails(std::string_view call, Kind kind);
-
-// Whether the call is the one that this attempt is about.
-bool is_tested(std::string_view call);
-
-// Whether a call that fails now only moves fewer bytes.
-bool is_shortened();
 
 }  // namespace failing
 

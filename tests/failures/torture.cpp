@@ -35,7 +35,7 @@ std::atomic<int> points = 0;
 int faults = 0;
 bool gave_up = false;
 
-struct Listener : testing::EmptyTestEventListener {
+struct Watcher : testing::EmptyTestEventListener {
   void OnTestPartResult(const testing::TestPartResult& result) override {
     if (result.fatally_failed()) gave_up = true;
   }
@@ -44,10 +44,6 @@ struct Listener : testing::EmptyTestEventListener {
 [[noreturn]] void die(const char* how) {
   std::fprintf(stderr, "%s: %s\n", how, point.data());
   std::_Exit(1);
-}
-
-void crashed(int) {
-  die("crash");
 }
 
 void watch() {
@@ -65,33 +61,31 @@ void clear_tables() {
 }
 
 // Gives the number of calls met, and whether one failed.
-std::pair<int, bool> run_with(const Fault& fault, int skipped) {
+std::pair<int, bool> run_with(std::string_view call, int error, int skipped) {
   ++points;
   gave_up = false;
   clear_tables();
   const int blocks = blocks_in_use();
   const int handles = scripted::open_handles();
-  Attempt attempt(fault, skipped);
-  Attempt::begin();
-  std::ignore = RUN_ALL_TESTS();
-  Attempt::end();
+  Attempt attempt(call, error, skipped);
+  attempt([] { return RUN_ALL_TESTS(); });
   clear_tables();
   const int kept = blocks_in_use() - blocks;
   const int open = scripted::open_handles() - handles;
   // A test that gave up leaves it all behind.
   if (!gave_up && (kept != 0 || open != 0)) {
     std::fprintf(stderr, "%d blocks and %d handles lost: %s, %s\n", kept, open, point.data(),
-                 std::string(attempt.failed()).c_str());
+                 std::string(attempt.failed).c_str());
     ++faults;
   }
-  return {attempt.met(), !attempt.failed().empty()};
+  return {attempt.met, !attempt.failed.empty()};
 }
 
-void torture(const std::string& test, const Fault& fault) {
+void torture(const std::string& test, std::string_view call, int error) {
   const auto attempt_at = [&](int skipped) {
-    std::snprintf(point.data(), point.size(), "%s, %s call %d, error %d", test.c_str(),
-                  fault.call.data(), skipped, fault.error);
-    return run_with(fault, skipped);
+    std::snprintf(point.data(), point.size(), "%s, %s call %d, error %d", test.c_str(), call.data(),
+                  skipped, error);
+    return run_with(call, error, skipped);
   };
   GTEST_FLAG_SET(filter, test);
   const auto begin = std::chrono::steady_clock::now();
@@ -114,8 +108,8 @@ int main(int argc, char** argv) {
   const std::string wanted = argc > 1 ? argv[1] : "";
   if (wanted.empty()) delete listeners.Release(listeners.default_result_printer());
   delete listeners.Release(listeners.default_xml_generator());
-  listeners.Append(new Listener);
-  for (const int sign : {SIGSEGV, SIGABRT, SIGFPE}) std::signal(sign, crashed);
+  listeners.Append(new Watcher);
+  for (const int sign : {SIGSEGV, SIGABRT, SIGFPE}) std::signal(sign, [](int) { die("crash"); });
   std::thread(watch).detach();
 
   zv_dll_open(ZARVO_LIBRARY, 1);  // the plugins find it then
@@ -125,10 +119,10 @@ int main(int argc, char** argv) {
     for (int j = 0; j < suite.total_test_count(); ++j) {
       const std::string test = suite.name() + std::string(".") + suite.GetTestInfo(j)->name();
       if (test.find(wanted) == test.npos) continue;
-      torture(test, {all_memory, ENOMEM});
+      torture(test, all_memory, ENOMEM);
 #ifndef _WIN32
-      torture(test, {all_calls, EIO});
-      torture(test, {all_calls, EINTR});
+      torture(test, all_calls, EIO);
+      torture(test, all_calls, EINTR);
 #endif
     }
   }
