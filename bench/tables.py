@@ -1,8 +1,9 @@
 #!/usr/bin/env python3
-"""Puts measurements into a document: tables.py DOCUMENT JSON...
+"""Puts measurements into a document: tables.py [--windows] DOCUMENT JSON...
 Each item's tables replace what stands between its two marks in the document, <!-- ITEM --> and
 <!-- /ITEM -->; an item without marks gets its own section at the end. A ratio is the time of who
-is named over ours."""
+is named over ours. With --windows all go into one table, between the marks of "windows"; its last
+column is our time over that of the same case in build/bench/results, measured on Linux."""
 import json
 import math
 import platform
@@ -45,19 +46,23 @@ def spoken(case):
     return SIZE.sub(lambda match: f"{match[1]}, {int(match[2]):,}", case)
 
 
+def compared(times):
+    """The cells of a case: the best peer, its ratio, all others, the limits. Another way of our own is
+    the last of the others, and stands for us where there is no first way."""
+    ours = [who for who in times if who.startswith("zarvo")]
+    ratios = {who: time / times[ours[0]] for who, time in times.items() if who != ours[0]}
+    limits = ", ".join(f"{who[6:]} {number(ratio)}" for who, ratio in ratios.items()
+                       if who.startswith("limit "))
+    peers = sorted((who in ours, ratio, who) for who, ratio in ratios.items()
+                   if not who.startswith("limit "))
+    best = peers.pop(0) if peers and not peers[0][0] else None
+    cells = [best[2], f"**{number(best[1])}**"] if best else ["", ""]
+    return cells + [", ".join(f"{who} {number(ratio)}" for _, ratio, who in peers), limits]
+
+
 def comparison(cases):
-    rows = []
-    for case, times in cases.items():
-        ratios = {who: time / times["zarvo"] for who, time in times.items()}
-        limits = [f"{who[6:]} {number(ratio)}" for who, ratio in ratios.items()
-                  if who.startswith("limit ")]
-        peers = sorted((ratio, who) for who, ratio in ratios.items()
-                       if who != "zarvo" and not who.startswith("limit "))
-        if not peers and not limits:
-            continue
-        best = f"{peers[0][1]} | **{number(peers[0][0])}**" if peers else " | "
-        others = ", ".join(f"{who} {number(ratio)}" for ratio, who in peers[1:])
-        rows.append(f"| {spoken(case)} | {best} | {others} | {', '.join(limits)} |")
+    rows = [f"| {spoken(case)} | {' | '.join(cells)} |" for case, cells in
+            ((case, compared(times)) for case, times in cases.items()) if any(cells)]
     if not rows:
         return []
     return ["| case | best peer | ratio | other peers | limit |", "|---|---|---|---|---|", *rows]
@@ -100,11 +105,31 @@ def put(document, mark, lines):
     return document.rstrip("\n") + f"\n\n## {mark}\n\n{block}\n"
 
 
+def on_windows(files):
+    """{"windows": every case beside the best and the other peers there, and beside Linux}"""
+    linux = medians(filter(Path.exists, (Path("build/bench/results", Path(file).name)
+                                         for file in files)))
+    lines = ["| item | case | best peer | ratio | other peers | over Linux |",
+             "|---|---|---|---|---|---|"]
+    for item, cases in medians(files).items():
+        for case, times in cases.items():
+            there = linux.get(item, {}).get(case, {}).get("zarvo")
+            over = number(times["zarvo"] / there) if there else ""
+            lines.append(f"| {item} | {spoken(case)} | {' | '.join(compared(times)[:3])} | {over} |")
+    return {"windows": lines}
+
+
+def on_linux(files):
+    """{item: its tables}"""
+    return {item: comparison(cases) + growth(cases) for item, cases in medians(files).items()}
+
+
 def main():
-    path = Path(sys.argv[1])
+    windows = sys.argv[1] == "--windows"
+    path, *files = sys.argv[1 + windows:]
+    path = Path(path)
     document = put(path.read_text(), "machine", machine())
-    for item, cases in medians(sys.argv[2:]).items():
-        lines = comparison(cases) + growth(cases)
+    for item, lines in (on_windows if windows else on_linux)(files).items():
         document = put(document, item, lines)
         print(f"\n{item}", *lines, sep="\n")
     path.write_text(document)

@@ -1,7 +1,5 @@
 // Byte order of whole arrays, beside a loop that is compiled for AVX2 alone and one pass over the
 // memory.
-#include <byteswap.h>
-
 #include <cstdlib>
 #include <string>
 #include <vector>

@@ -1,5 +1,7 @@
 // Ten thousand names matched against a hundred plugins with four patterns each.
+#ifndef _WIN32
 #include <glib.h>
+#endif
 
 #include <cctype>
 #include <string>
@@ -20,15 +22,19 @@ struct Plugins {
   std::vector<std::vector<char*>> formats;
   std::vector<zv_plugin_t> records;
   std::vector<zv_plugin_t*> pointers;
+#ifndef _WIN32
   std::vector<GPatternSpec*> compiled;  // pattern_count for each plugin
+#endif
 };
 
 void add_entry(Plugins& plugins, const std::vector<std::string>& patterns) {
   std::string entry = "A format|";
   for (const std::string& pattern : patterns) {
     entry += pattern + '|';
+#ifndef _WIN32
     const std::string whole = pattern[0] == '.' ? '*' + pattern : pattern;
     plugins.compiled.push_back(g_pattern_spec_new(whole.c_str()));
+#endif
   }
   plugins.entries.push_back(entry);
 }
@@ -67,6 +73,7 @@ std::vector<std::string> make_names() {
   return names;
 }
 
+#ifndef _WIN32
 // What a program with GLib would do: the patterns compiled once, the name in lower case.
 uint64_t first_by_compiled(const Plugins& plugins, const std::string& path) {
   char* const base = g_path_get_basename(path.c_str());
@@ -80,6 +87,7 @@ uint64_t first_by_compiled(const Plugins& plugins, const std::string& path) {
   g_free(base);
   return i / pattern_count;
 }
+#endif
 
 void add(const char* what, bool wildcards) {
   auto* const plugins = new Plugins;
@@ -95,11 +103,13 @@ void add(const char* what, bool wildcards) {
     }
     return sum;
   });
+#ifndef _WIN32
   item.add(what, "GPatternSpec compiled before", [=] {
     uint64_t sum = 0;
     for (const std::string& name : names) sum += first_by_compiled(*plugins, name);
     return sum;
   });
+#endif
 }
 
 }  // namespace

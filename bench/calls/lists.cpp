@@ -1,5 +1,7 @@
 // String lists: split, appended to, freed of duplicates.
+#ifndef _WIN32
 #include <glib.h>
+#endif
 
 #include <cstring>
 #include <memory>
@@ -22,10 +24,12 @@ struct FreeList {
 };
 using List = std::unique_ptr<char*[], FreeList>;
 
+#ifndef _WIN32
 struct FreeArray {
   void operator()(GPtrArray* array) const { g_ptr_array_unref(array); }
 };
 using Array = std::unique_ptr<GPtrArray, FreeArray>;
+#endif
 
 // File names, each one `copies` times, the copies far from each other.
 Texts make_texts(int count, int copies) {
@@ -56,12 +60,14 @@ void add_split(int count) {
     zv_strlist_free(list, pieces);
     return pieces;
   });
+#ifndef _WIN32
   item.add(what, "g_strsplit", [=] {
     char** const list = g_strsplit(text.c_str(), ",", -1);
     const guint pieces = g_strv_length(list) - 1;  // it counts the empty one at the end
     g_strfreev(list);
     return pieces;
   });
+#endif
   item.add(what, "std::vector<std::string>", [=] { return split_by_find(text).size(); });
 }
 
@@ -76,11 +82,13 @@ void add_append(int count) {
     zv_strlist_free(list, n);
     return n;
   });
+#ifndef _WIN32
   item.add(what, "GPtrArray", [=] {
     const Array array(g_ptr_array_new_with_free_func(g_free));
     for (const std::string& text : texts) g_ptr_array_add(array.get(), g_strdup(text.c_str()));
     return array->len;
   });
+#endif
   item.add(what, "std::vector<std::string>", [=] {
     std::vector<std::string> list;
     for (const std::string& text : texts) list.emplace_back(text.c_str());
@@ -96,11 +104,13 @@ List make_list(const Texts& texts) {
   return List(list);
 }
 
+#ifndef _WIN32
 Array make_array(const Texts& texts) {
   Array array(g_ptr_array_new_with_free_func(g_free));
   for (const std::string& text : texts) g_ptr_array_add(array.get(), g_strdup(text.c_str()));
   return array;
 }
+#endif
 
 // The first of each stays. What is left is moved up, as the list does it.
 void keep_first(Texts& texts) {
@@ -120,6 +130,7 @@ void keep_first_by_views(Texts& texts) {
   texts.resize(kept.size());
 }
 
+#ifndef _WIN32
 void keep_first_in_array(Array& array) {
   GHashTable* const seen = g_hash_table_new(g_str_hash, g_str_equal);
   GPtrArray* const kept = g_ptr_array_new_with_free_func(g_free);
@@ -129,6 +140,7 @@ void keep_first_in_array(Array& array) {
   g_hash_table_unref(seen);
   array.reset(kept);
 }
+#endif
 
 void add_duplicates(int count) {
   const Texts texts = make_texts(count, 4);
@@ -142,9 +154,11 @@ void add_duplicates(int count) {
       what, "std::unordered_set", [=] { return texts; }, keep_first, size);
   item.add_prepared(
       what, "std::unordered_set of views", [=] { return texts; }, keep_first_by_views, size);
+#ifndef _WIN32
   item.add_prepared(
       what, "GHashTable", [=] { return make_array(texts); }, keep_first_in_array,
       [](const Array& array) { return array->len; });
+#endif
 }
 
 }  // namespace

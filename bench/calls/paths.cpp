@@ -1,7 +1,9 @@
 // The path algebra over a thousand paths, and the path map as it grows.
+#ifndef _WIN32
 #include <apr_file_info.h>
 #include <apr_pools.h>
 #include <glib.h>
+#endif
 
 #include <cstring>
 #include <filesystem>
@@ -39,7 +41,7 @@ Paths make_paths(bool absolute) {
 
 Paths tidied(const Paths& untidy) {
   Paths paths;
-  for (const std::string& path : untidy) paths.push_back(fs::path(path).lexically_normal());
+  for (const std::string& path : untidy) paths.push_back(fs::path(path).lexically_normal().generic_string());
   return paths;
 }
 
@@ -51,6 +53,7 @@ uint64_t sum(const Paths& paths, Size size) {
   return total;
 }
 
+#ifndef _WIN32
 class Pool {
  public:
   explicit Pool(apr_pool_t* parent) { apr_pool_create(&pool_, parent); }
@@ -70,8 +73,9 @@ size_t merged_size(const char* root, const std::string& path, const Pool& pool) 
 }
 
 // APR's pool is emptied after each thousand.
-uint64_t merged_sizes(const Paths& paths, const char* root, apr_pool_t* parent) {
-  const Pool pool(parent);
+uint64_t merged_sizes(const Paths& paths, const char* root) {
+  static const Pool parent(nullptr);
+  const Pool pool(parent.get());
   return sum(paths, [&](const std::string& path) { return merged_size(root, path, pool); });
 }
 
@@ -81,8 +85,9 @@ size_t canonical_size(const std::string& path, const char* folder) {
   g_free(canonical);
   return size;
 }
+#endif
 
-void add_normalize(const Paths& paths, apr_pool_t* pool) {
+void add_normalize(const Paths& paths) {
   const char* const what = "normalise";
   item.add(what, "zarvo", [=] {
     return sum(paths, [](const std::string& path) {
@@ -92,7 +97,15 @@ void add_normalize(const Paths& paths, apr_pool_t* pool) {
       return std::strlen(text);
     });
   });
-  item.add(what, "apr_filepath_merge", [=] { return merged_sizes(paths, "/", pool); });
+#ifdef _WIN32
+  item.add(what, "_fullpath", [=] {
+    return sum(paths, [](const std::string& path) {
+      char text[ZV_PATH_MAX];
+      return std::strlen(_fullpath(text, path.c_str(), sizeof text));
+    });
+  });
+#else
+  item.add(what, "apr_filepath_merge", [=] { return merged_sizes(paths, "/"); });
   item.add(what, "g_canonicalize_filename", [=] {
     return sum(paths, [](const std::string& path) { return canonical_size(path, "/"); });
   });
@@ -101,10 +114,11 @@ void add_normalize(const Paths& paths, apr_pool_t* pool) {
       return fs::path(path).lexically_normal().native().size();
     });
   });
+#endif
 }
 
 // Only what is clean before can be compared: we make it absolute, and the others clean it too.
-void add_absolute(const Paths& untidy, apr_pool_t* pool) {
+void add_absolute(const Paths& untidy) {
   const Paths paths = tidied(untidy);
   const char* const what = "absolute";
   item.add(what, "zarvo", [=] {
@@ -114,10 +128,12 @@ void add_absolute(const Paths& untidy, apr_pool_t* pool) {
       return std::strlen(text);
     });
   });
-  item.add(what, "apr_filepath_merge", [=] { return merged_sizes(paths, base, pool); });
+#ifndef _WIN32
+  item.add(what, "apr_filepath_merge", [=] { return merged_sizes(paths, base); });
   item.add(what, "g_canonicalize_filename", [=] {
     return sum(paths, [](const std::string& path) { return canonical_size(path, base); });
   });
+#endif
   item.add(what, "std::filesystem", [=] {
     const fs::path folder(base);
     return sum(paths, [&](const std::string& path) {
@@ -162,6 +178,7 @@ void add_split(const Paths& untidy) {
       return static_cast<size_t>(std::distance(whole.begin(), whole.end()));
     });
   });
+#ifndef _WIN32
   item.add("split", "g_strsplit", [=] {
     return sum(paths, [](const std::string& path) {
       char** const pieces = g_strsplit(path.c_str(), "/", -1);
@@ -170,6 +187,7 @@ void add_split(const Paths& untidy) {
       return count;
     });
   });
+#endif
 }
 
 void add_pieces(const Paths& untidy) {
@@ -193,6 +211,18 @@ void add_pieces(const Paths& untidy) {
              path.extension().native().size();
     });
   });
+#ifdef _WIN32
+  item.add(what, "_splitpath", [=] {
+    return sum(paths, [](const std::string& path) {
+      char folder[ZV_PATH_MAX];
+      char name[ZV_PATH_MAX];
+      char extension[ZV_PATH_MAX];
+      _splitpath(path.c_str(), nullptr, folder, name, extension);
+      // The extension is a part of the name, and the last separator none of the folder.
+      return std::strlen(folder) - 1 + std::strlen(name) + 2 * std::strlen(extension);
+    });
+  });
+#else
   item.add(what, "GLib", [=] {
     return sum(paths, [](const std::string& path) {
       char* const folder = g_path_get_dirname(path.c_str());
@@ -205,6 +235,7 @@ void add_pieces(const Paths& untidy) {
       return size;
     });
   });
+#endif
 }
 
 struct ClearMap {
@@ -243,13 +274,13 @@ void add_locate() {
 }  // namespace
 
 void bench::add_cases() {
+#ifndef _WIN32
   apr_initialize();
-  static apr_pool_t* pool = nullptr;
-  apr_pool_create(&pool, nullptr);
+#endif
   const Paths absolute = make_paths(true);
   const Paths relative = make_paths(false);
-  add_normalize(absolute, pool);
-  add_absolute(relative, pool);
+  add_normalize(absolute);
+  add_absolute(relative);
   add_relative(absolute);
   add_split(relative);
   add_pieces(absolute);

@@ -1,5 +1,7 @@
 // Texts without case, trimmed, changed in case, replaced in: 64 bytes and 64 KiB.
+#ifndef _WIN32
 #include <glib.h>
+#endif
 #include <strings.h>
 
 #include <algorithm>
@@ -15,6 +17,13 @@
 namespace {
 
 const bench::Item item("texts");
+
+// What strcasecmp() is called there.
+#ifdef _WIN32
+const char* const system_compare = "_stricmp";
+#else
+const char* const system_compare = "strcasecmp";
+#endif
 
 std::string prose(size_t size) {
   const std::string line = "The quick brown fox jumps over the lazy dog; Pack My Box, 12 times. ";
@@ -80,6 +89,7 @@ void add_string_edit(const std::string& what, const char* who, const std::string
       [](const std::vector<std::string>& texts) { return hash(texts[0]); });
 }
 
+#ifndef _WIN32
 // GString frees nothing by itself.
 class GTexts {
  public:
@@ -97,21 +107,31 @@ class GTexts {
  private:
   std::vector<GString*> texts_;
 };
+#endif
 
 void add_search(const std::string& what, const std::string& text, const std::string& needle) {
   item.add(what, "zarvo", [=] { return zv_stristr(text.c_str(), needle.c_str()) - text.c_str(); });
-  item.add(what, "strcasestr",
-           [=] { return strcasestr(text.c_str(), needle.c_str()) - text.c_str(); });
   item.add(what, "std::search", [=] {
     return std::search(text.begin(), text.end(), needle.begin(), needle.end(), same_letter) -
            text.begin();
   });
+#ifdef _WIN32
+  // All that its C runtime has.
+  item.add(what, "_strlwr and strstr", [=] {
+    std::string lower = text;
+    _strlwr(lower.data());
+    return std::strstr(lower.c_str(), needle.c_str()) - lower.c_str();
+  });
+#else
+  item.add(what, "strcasestr",
+           [=] { return strcasestr(text.c_str(), needle.c_str()) - text.c_str(); });
   item.add(what, "g_ascii_strdown and strstr", [=] {
     char* const lower = g_ascii_strdown(text.c_str(), -1);
     const auto place = std::strstr(lower, needle.c_str()) - lower;
     g_free(lower);
     return place;
   });
+#endif
 }
 
 void add_letter(size_t size) {
@@ -135,9 +155,11 @@ void add_compare(size_t size) {
   std::transform(b.begin(), b.end(), b.begin(), [](unsigned char ch) { return std::toupper(ch); });
   const std::string what = sized("compare without case", size);
   item.add(what, "zarvo", [=] { return zv_stricmp(a.c_str(), b.c_str()) == 0; });
-  item.add(what, "strcasecmp", [=] { return strcasecmp(a.c_str(), b.c_str()) == 0; });
+  item.add(what, system_compare, [=] { return strcasecmp(a.c_str(), b.c_str()) == 0; });
+#ifndef _WIN32
   item.add(what, "g_ascii_strcasecmp",
            [=] { return g_ascii_strcasecmp(a.c_str(), b.c_str()) == 0; });
+#endif
   item.add(what, "std::equal",
            [=] { return std::equal(a.begin(), a.end(), b.begin(), b.end(), same_letter); });
 }
@@ -146,7 +168,9 @@ void add_trim(size_t size) {
   const std::string text = "   \t " + prose(size - 11) + ".\n   \r\n";
   const std::string what = sized("trim", size);
   add_edit(what, "zarvo", text, zv_strtrim);
+#ifndef _WIN32
   add_edit(what, "g_strstrip", text, [](char* s) { g_strstrip(s); });
+#endif
   add_string_edit(what, "std::find_if_not and erase", text, [](std::string& s) {
     const auto is_space = [](unsigned char ch) { return std::isspace(ch) != 0; };
     s.erase(std::find_if_not(s.rbegin(), s.rend(), is_space).base(), s.end());
@@ -165,11 +189,15 @@ void add_case(size_t size) {
   }();
   add_edit(what, "limit memcpy", text,
            [=](char* s) { std::memcpy(s, result.c_str(), result.size()); });
+#ifdef _WIN32
+  add_edit(what, "_strupr", text, [](char* s) { _strupr(s); });
+#else
   add_edit(what, "g_ascii_strup", text, [](char* s) {
     char* const upper = g_ascii_strup(s, -1);
     std::memcpy(s, upper, std::strlen(upper));
     g_free(upper);
   });
+#endif
   add_string_edit(what, "std::transform", text, [](std::string& s) {
     std::transform(s.begin(), s.end(), s.begin(),
                    [](unsigned char ch) { return std::toupper(ch); });
@@ -193,6 +221,7 @@ void add_replace(const char* name, size_t size, const std::string& needle,
   add_edit(what, "zarvo", text, [=](char* s) { zv_strreplstr(s, needle.c_str(), repl.c_str()); });
   add_string_edit(what, "std::string built anew", text,
                   [=](std::string& s) { replace_by_find(s, needle, repl); });
+#ifndef _WIN32
   item.add_prepared(
       what, "g_string_replace", [=] { return GTexts(text); },
       [=](GTexts& texts) {
@@ -200,6 +229,7 @@ void add_replace(const char* name, size_t size, const std::string& needle,
           g_string_replace(one, needle.c_str(), repl.c_str(), 0);
       },
       [](const GTexts& texts) { return hash(texts.all()[0]->str); });
+#endif
 }
 
 }  // namespace
@@ -224,7 +254,9 @@ void bench::add_cases() {
     const std::string sought = text.substr(half, half);
     item.add(what, "zarvo",
              [=] { return zv_stristr(text.c_str(), sought.c_str()) - text.c_str(); });
+#ifndef _WIN32
     item.add(what, "strcasestr",
              [=] { return strcasestr(text.c_str(), sought.c_str()) - text.c_str(); });
+#endif
   }
 }
