@@ -17,9 +17,9 @@ SECONDS = {"ns": 1e-9, "us": 1e-6, "ms": 1e-3, "s": 1.0}
 SIZE = re.compile(r"(.*) @(\d+)$")
 
 
-def medians(files):
+def medians(files, by_clock=False):
     """{item: {case: {who: median time}}}, in the order in which they were added: the runs of a file
-    come in random order."""
+    come in random order. Windows tells the processor's time too coarsely."""
     times = defaultdict(lambda: defaultdict(lambda: defaultdict(list)))
     for file in files:
         runs = json.loads(Path(file).read_text())["benchmarks"]
@@ -29,7 +29,8 @@ def medians(files):
             if run.get("error_occurred"):
                 sys.exit(f"{run['run_name']}: {run.get('error_message')}")
             item, case, who, *how = run["run_name"].split("/")
-            time = run["real_time" if "real_time" in how or "manual_time" in how else "cpu_time"]
+            real = by_clock or "real_time" in how or "manual_time" in how
+            time = run["real_time" if real else "cpu_time"]
             times[item][case][who].append(time * SECONDS[run["time_unit"]])
     return {item: {case: {who: statistics.median(values) for who, values in runs.items()}
                    for case, runs in cases.items()}
@@ -111,7 +112,7 @@ def on_windows(files):
                                          for file in files)))
     lines = ["| item | case | best peer | ratio | other peers | over Linux |",
              "|---|---|---|---|---|---|"]
-    for item, cases in medians(files).items():
+    for item, cases in medians(files, by_clock=True).items():
         for case, times in cases.items():
             there = linux.get(item, {}).get(case, {}).get("zarvo")
             over = number(times["zarvo"] / there) if there else ""

@@ -218,8 +218,10 @@ void add_pieces(const Paths& untidy) {
       char name[ZV_PATH_MAX];
       char extension[ZV_PATH_MAX];
       _splitpath(path.c_str(), nullptr, folder, name, extension);
-      // The extension is a part of the name, and the last separator none of the folder.
-      return std::strlen(folder) - 1 + std::strlen(name) + 2 * std::strlen(extension);
+      // The others count the extension in the name too, see none in ".profile", and give the folder
+      // without the last separator.
+      const size_t times = *name != '\0' ? 2 : 1;
+      return std::strlen(folder) - 1 + std::strlen(name) + times * std::strlen(extension);
     });
   });
 #else
