@@ -8,10 +8,10 @@
 
 namespace {
 
-// Called a few times a second, and once more at the end.
+// Called a few times a second, and once more at the end. A reason may follow on the same line.
 constexpr auto show_progress = [](std::int64_t done, std::int64_t total) {
   const double share = total > 0 ? static_cast<double>(done) / static_cast<double>(total) : 0;
-  if (total > 0) std::fprintf(stderr, "\r%3.0f %%%s", 100 * share, done == total ? "\n" : "");
+  if (share > 0) std::fprintf(stderr, "\r%3.0f %% %s", 100 * share, done == total ? "\n" : "");
   return true;  // go on; false would cancel
 };
 

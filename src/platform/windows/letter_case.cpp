@@ -9,8 +9,12 @@ namespace zv::platform {
 namespace {
 
 // Most programs never leave the "C" locale, the one without a code page.
+bool has_ascii_case() {
+  return ::___lc_codepage_func() == 0;
+}
+
 const int32_t* map_of(int (*convert)(int), const ByteMap& ascii, ByteMap& room) {
-  if (::___lc_codepage_func() == 0) return ascii.data();
+  if (has_ascii_case()) return ascii.data();
   for (int byte = 0; byte < 256; ++byte) room[static_cast<size_t>(byte)] = convert(byte);
   return room.data();
 }
@@ -30,12 +34,20 @@ int compare_without_case(const char* a, const char* b) {
 }
 
 // _strnicmp() itself takes no more than INT_MAX bytes, and Wine's orders bytes above 0x7F as
-// signed.
+// signed. What is equal as it stands, most of a text, is not asked for its case.
 int compare_without_case(const char* a, const char* b, size_t n) {
+  const bool ascii = has_ascii_case();
+  const auto lower = [ascii](char ch) {
+    const auto byte = static_cast<unsigned char>(ch);
+    return ascii ? ascii_lower[byte] : ::tolower(byte);
+  };
   for (size_t i = 0; i < n; ++i) {
-    const int difference =
-        ::tolower(static_cast<unsigned char>(a[i])) - ::tolower(static_cast<unsigned char>(b[i]));
-    if (difference != 0 || a[i] == '\0') return difference;
+    if (a[i] != b[i]) {
+      const int difference = lower(a[i]) - lower(b[i]);
+      if (difference != 0) return difference;
+    } else if (a[i] == '\0') {
+      return 0;
+    }
   }
   return 0;
 }
