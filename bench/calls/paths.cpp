@@ -41,7 +41,8 @@ Paths make_paths(bool absolute) {
 
 Paths tidied(const Paths& untidy) {
   Paths paths;
-  for (const std::string& path : untidy) paths.push_back(fs::path(path).lexically_normal().generic_string());
+  for (const std::string& path : untidy)
+    paths.push_back(fs::path(path).lexically_normal().generic_string());
   return paths;
 }
 
