@@ -7,6 +7,7 @@ run: what the client says of it.
 import contextlib
 import shutil
 import socket
+import socketserver
 import ssl
 import subprocess
 import sys
@@ -106,35 +107,30 @@ def refuse(peer, refused):
         peer.write(b"%d so be it\r\n" % code)
 
 
-class Server:
+class Server(socketserver.ThreadingTCPServer):
     """Serves each client on a thread of its own until it is told to stop."""
+    daemon_threads = True
 
     def __init__(self, certificate, behave, version=None):
+        super().__init__(("127.0.0.1", 0), None)
+        self.port = self.server_address[1]
         self.behave = behave
         self.context = ssl.SSLContext(ssl.PROTOCOL_TLS_SERVER)
         self.context.load_cert_chain(certificate)
         if version:
             self.context.set_ciphers("ALL:@SECLEVEL=0")
             self.context.minimum_version = self.context.maximum_version = version
-        self.listener = socket.create_server(("127.0.0.1", 0))
-        self.port = self.listener.getsockname()[1]
-        threading.Thread(target=self.serve, daemon=True).start()
+        threading.Thread(target=self.serve_forever, args=[0.02], daemon=True).start()
 
-    def serve(self):
-        with contextlib.suppress(OSError):
-            while True:
-                connection, _ = self.listener.accept()
-                threading.Thread(target=self.converse, args=[connection], daemon=True).start()
-
-    def converse(self, connection):
-        connection.settimeout(20)
-        connection.setsockopt(socket.IPPROTO_TCP, socket.TCP_NODELAY, 1)
-        with connection, contextlib.suppress(OSError, ValueError):
-            self.behave(Conversation(connection, self.context))
+    def finish_request(self, request, client_address):
+        request.settimeout(20)
+        request.setsockopt(socket.IPPROTO_TCP, socket.TCP_NODELAY, 1)
+        with contextlib.suppress(OSError, ValueError):
+            self.behave(Conversation(request, self.context))
 
     def close(self):
-        self.listener.shutdown(socket.SHUT_RDWR)
-        self.listener.close()
+        self.shutdown()
+        self.server_close()
 
 
 class OpensslServer:
@@ -160,22 +156,21 @@ class OpensslServer:
 
 CLOSED, ENCRYPTION, SILENCE, CANCELLED, REFUSED = 8, 20, 4, 7, 12
 TLS_1_1, TLS_1_2 = ssl.TLSVersion.TLSv1_1, ssl.TLSVersion.TLSv1_2
+CERTIFICATE = f"{ENCRYPTION} certificate"
 WITH = f"{ENCRYPTION} encryption with localhost: "
 
 # What a certificate says, who is asked for, and what the client says of it: "" is a good end.
 CERTIFICATES = [
-    ("good", "localhost", ""),
-    ("good", "LocalHost", ""),
-    ("good", "127.0.0.1", "issued for localhost"),
-    ("others", "localhost", "issued for example.test, b.test, 10.0.0.1"),
-    ("expired", "localhost", "expired on 2021-01-01"),
-    ("early", "localhost", "not valid before 2098-12-31"),
-    ("address", "127.0.0.1", ""),
-    ("address", "localhost", "issued for 127.0.0.1"),
-    ("written", "127.0.0.1", "issued for 127.0.0.1"),
-    ("common", "localhost", "issued for no name"),
-    ("wild", "localhost", "issued for *.localhost"),
-    ("itself", "localhost", "signed by itself, and not trusted"),
+    ("DNS:localhost", "LocalHost", ""),
+    ("DNS:localhost", "127.0.0.1", "issued for localhost"),
+    ("DNS:x.test, DNS:y.test, IP:10.0.0.1", "localhost", "issued for x.test, y.test, 10.0.0.1"),
+    ("DNS:localhost", "localhost", "expired on 2021-01-01", {"end": "20210101000000Z"}),
+    ("DNS:localhost", "localhost", "not valid before 2098-12-31", {"begin": "20981231000000Z"}),
+    ("IP:127.0.0.1", "127.0.0.1", ""),
+    ("IP:127.0.0.1", "localhost", "issued for 127.0.0.1"),
+    ("DNS:127.0.0.1", "127.0.0.1", "issued for 127.0.0.1"),
+    ("", "localhost", "issued for no name", {"subject": "localhost"}),
+    ("DNS:*.localhost", "localhost", "issued for *.localhost"),
 ]
 
 # What a server does, what the client says of it, with which version, by which scheme.
@@ -202,19 +197,8 @@ class Encryption(unittest.TestCase):
     def setUpClass(cls):
         shutil.rmtree(folder, ignore_errors=True)
         folder.mkdir(parents=True)
-        authority = Authority(folder)
-        cls.trusted = authority.certificate
-        cls.certificates = {
-            "good": authority.issue("good", "DNS:localhost"),
-            "others": authority.issue("others", "DNS:example.test, DNS:b.test, IP:10.0.0.1"),
-            "expired": authority.issue("expired", "DNS:localhost", end="20210101000000Z"),
-            "early": authority.issue("early", "DNS:localhost", begin="20981231000000Z"),
-            "address": authority.issue("address", "IP:127.0.0.1"),
-            "written": authority.issue("written", "DNS:127.0.0.1"),
-            "common": authority.issue("common", subject="localhost"),
-            "wild": authority.issue("wild", "DNS:*.localhost"),
-            "itself": authority.issue_itself("itself", "localhost"),
-        }
+        cls.authority = Authority(folder)
+        cls.certificate = cls.authority.issue("good", "DNS:localhost")
 
     def expect(self, server, expected, host="localhost", trusted=None, more=(), scheme="https",
                fetch="zarvo_fetch", **environment):
@@ -224,7 +208,7 @@ class Encryption(unittest.TestCase):
         copy.write_bytes(b"old")
         try:
             found = start(*emulator, programs / (fetch + suffix), f"{scheme}://{host}:{server.port}/f",
-                          shown(copy), trusted or shown(self.trusted) if trusted != "" else "", *more,
+                          shown(copy), trusted or shown(self.authority.certificate) if trusted != "" else "", *more,
                           env=environment)
         finally:
             server.close()
@@ -232,38 +216,38 @@ class Encryption(unittest.TestCase):
         self.assertEqual(copy.read_bytes(), TEXT if expected == "0 " else b"old")
 
     def good(self, *behave):
-        return Server(self.certificates["good"], *behave or [good])
+        return Server(self.certificate, *behave or [good])
 
     def test_certificates(self):
-        for name, host, reason in CERTIFICATES:
-            with self.subTest(name, host=host):
+        for names, host, reason, *more in CERTIFICATES:
+            with self.subTest(names, host=host):
                 heard = []
-                server = Server(self.certificates[name], lambda peer: heard.append(good(peer)))
-                end = f"{ENCRYPTION} certificate of {host}: {reason}" if reason else "0 "
-                self.expect(server, end, host)
+                server = Server(self.authority.issue("next", names, **dict(*more)),
+                                lambda peer: heard.append(good(peer)))
+                self.expect(server, f"{CERTIFICATE} of {host}: {reason}" if reason else "0 ", host)
                 self.assertEqual(bool(heard), not reason, "a request left")
 
     def test_trust(self):
         """Without a file it goes by the system's certificates, which on Linux two variables name."""
-        itself, hashed = self.certificates["itself"], folder / "hashed"
+        itself, ours = self.authority.issue_itself("itself", "localhost"), self.authority.certificate
         self.expect(Server(itself, good), "0 ", trusted=as_windows(itself) if emulator else itself)
-        stranger = f"{ENCRYPTION} certificate of localhost: its issuer is not trusted"
-        self.expect(self.good(), stranger, trusted="")
+        not_trusted = f"{CERTIFICATE} of localhost: signed by itself, and not trusted"
+        self.expect(Server(itself, good), not_trusted, SSL_CERT_FILE=str(itself))
+        self.expect(self.good(), f"{CERTIFICATE} of localhost: its issuer is not trusted", trusted="")
         if not emulator:
+            hashed = folder / "hashed"
             hashed.mkdir()
-            shutil.copy(self.trusted, hashed)
+            shutil.copy(ours, hashed)
             subprocess.run(["openssl", "rehash", hashed], check=True)
-            self.expect(self.good(), "0 ", trusted="", SSL_CERT_FILE=str(self.trusted))
+            self.expect(self.good(), "0 ", trusted="", SSL_CERT_FILE=str(ours))
             self.expect(self.good(), "0 ", trusted="", SSL_CERT_DIR=str(hashed))
-            self.expect(Server(itself, good), f"{ENCRYPTION} certificate of localhost: signed by itself, "
-                        "and not trusted", SSL_CERT_FILE=str(itself))
 
     def test_behaviours(self):
         for name, behave, end, *more in BEHAVIOURS:
             with self.subTest(name):
                 version, scheme = [*more, *(None, "https")[len(more):]]
                 self.expect(self.good(behave, version), end, scheme=scheme)
-        self.expect(OpensslServer(self.certificates["good"]), WITH + "it wants a second handshake")
+        self.expect(OpensslServer(self.certificate), WITH + "it wants a second handshake")
 
     def test_redirect(self):
         """From http:// into encryption; on the way back to http:// it would be refused."""

@@ -7,21 +7,23 @@ machine's files where it can.
 """
 import gzip
 import os
-import subprocess
 import sys
 import tempfile
 import unittest
 from pathlib import Path
 
-from installed import CONSUMER, Installed, run, start
+from installed import CONSUMER, SOURCE, Installed, run
+from programs import start
+
+sys.path.append(str(SOURCE / "docs"))
+import header  # noqa: E402  pylint: disable=wrong-import-position
 
 NAMES = ["libzarvo1", "libzarvo-tls1", "libzarvo-dev", "zv"]
 
 
 def installed_names():
-    found = subprocess.run(["dpkg-query", "-W", "-f", "${db:Status-Status} ${Package}\n", *NAMES],
-                           stdout=subprocess.PIPE, stderr=subprocess.DEVNULL, text=True, check=False)
-    return [line.split()[1] for line in found.stdout.splitlines() if line.startswith("installed ")]
+    found = start("dpkg-query", "-W", "-f", "${db:Status-Status} ${Package}\n", *NAMES)[1]
+    return [line.split()[1] for line in found.splitlines() if line.startswith("installed ")]
 
 
 class Debian(unittest.TestCase):
@@ -29,28 +31,24 @@ class Debian(unittest.TestCase):
     def setUpClass(cls):
         if installed_names():
             raise AssertionError(f"remove your own first: {' '.join(installed_names())}")
+        cls.addClassCleanup(lambda: installed_names() and run("dpkg", "--purge", *NAMES))
         run("dpkg", "--install", *packages)
-        cls.scratch = tempfile.TemporaryDirectory()
-        cls.installed = Installed(Path(cls.scratch.name))
-
-    @classmethod
-    def tearDownClass(cls):
-        cls.scratch.cleanup()
-        if installed_names():
-            run("dpkg", "--purge", *NAMES)
+        scratch = tempfile.TemporaryDirectory()
+        cls.addClassCleanup(scratch.cleanup)
+        cls.installed = Installed(Path(scratch.name))
 
     def test_1_applications(self):
-        for words in (["--cflags"], ["--libs"]):  # the system's own folders need no mention
-            self.assertNotIn("/usr", " ".join(self.installed.pkg_config(*words)))
-        self.installed.expect_all_consumers(self)
-
-    def test_1_dependencies(self):
-        """An application's package finds out by itself what it depends on."""
+        # The system's own folders need no mention.
+        self.assertNotIn("/usr", " ".join(self.installed.pkg_config("--cflags", "--libs")))
+        self.installed.expect_consumers(self)
+        programs = self.installed.build_with_cmake(Path("/usr/share/doc/libzarvo-dev/examples"))
+        self.assertIn("bin/walk\n", run(programs / "walk", programs.parent, "walk", "1"))
+        # An application's package finds out by itself what it depends on.
         program = self.installed.compile(CONSUMER / "consumer.c", "-lzarvo")
         (self.installed.root / "debian").mkdir()
         (self.installed.root / "debian/control").write_text("Source: x\n\nPackage: x\nArchitecture: any\n")
-        found = run("dpkg-shlibdeps", "-O", program, cwd=self.installed.root)
-        self.assertIn("libzarvo1 (>= 1.0.0~beta)", found)
+        self.assertIn("libzarvo1 (>= 1.0.0~beta)",
+                      run("dpkg-shlibdeps", "-O", program, cwd=self.installed.root))
 
     def test_1_tool(self):
         self.assertEqual(run("zv", "--version"), "zv 1.0.0b\n")
@@ -61,17 +59,14 @@ class Debian(unittest.TestCase):
         completion = "/usr/share/bash-completion/completions/zv"
         self.assertIn("zv", run("bash", "-c", f"source {completion} && complete -p zv"))
 
-    def test_1_examples(self):
-        programs = self.installed.build_with_cmake(Path("/usr/share/doc/libzarvo-dev/examples"))
-        self.assertIn("bin/walk\n", run(programs / "walk", programs.parent, "walk", "1"))
-
     def test_1_documents(self):
-        for section, name, title in (
-                (3, "zarvo", "same application code"), (3, "zv_copy", "Copying between"),
-                (3, "zarvo_strlist", "String lists"), (1, "zv", "the same on every platform")):
-            code, page, warnings = start("man", "--warnings", "-P", "cat", section, name)
+        families = header.read(SOURCE / "include/zarvo.h")[1]
+        for name, texts in (("zv", ["the same on every platform"]), ("zv_copy", ["Copying between"]),
+                            *((f"zarvo_{family.name}", [family.title, *sum(family.examples, [])])
+                              for family in families)):
+            code, page, warnings = start("man", "--warnings", "-P", "cat", name, env={"MANWIDTH": "200"})
             self.assertEqual((code, warnings), (0, ""))
-            self.assertIn(title, page)
+            self.assertEqual([text for text in texts if text not in page], [])
         for name in NAMES:
             folder = Path("/usr/share/doc", name)
             self.assertIn("MIT License", (folder / "copyright").read_text())

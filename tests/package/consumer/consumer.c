@@ -1,18 +1,13 @@
 /* An application of the installed package, in C99: calls that take and give each kind of thing that
    crosses the interface. Prints what is wrong and ends with 1, or prints "consumer: ok". */
+#include <stddef.h>
 #include <stdio.h>
 #include <string.h>
 #include <zarvo.h>
 
 static int failures;
 
-static void expect(int truth, const char* what) {
-  if (truth) return;
-  printf("consumer: not so: %s\n", what);
-  ++failures;
-}
-
-#define EXPECT(truth) expect((truth) != 0, #truth)
+#define EXPECT(truth) failures += (truth) ? 0 : printf("consumer: not so: %s\n", #truth)
 
 int main(void) {
   char path[ZV_PATH_MAX] = "a\\.\\b/../c.txt";
@@ -22,6 +17,7 @@ int main(void) {
   struct _stat64 status;
   FILE* const file = fopen("consumer.txt", "wb");
 
+  EXPECT(offsetof(dirsel_t, show_hidden) == 24 && offsetof(zv_plugin_t, module) == 40);
   EXPECT(strcmp(zarvo_version(), "1.0.0b") == 0);
   EXPECT(zv_strlist(&list, "one,three,", ',') == 2);
   EXPECT(zv_strlist_iidx(list, -1, "THREE") == 1 && zv_strlist_free(list, 2) == 0);
