@@ -11,7 +11,7 @@ namespace zv {
 inline size_t sequence_size(const unsigned char* bytes, size_t size) {
   if (size < 2 || bytes[0] != 0x30) return 0;
   const size_t more = bytes[1] < 0x80 ? 0 : bytes[1] - 0x80U;  // bytes of the length
-  if (more > 3 || size < 2 + more) return 0;
+  if (bytes[1] == 0x80 || more > 3 || size < 2 + more) return 0;
   size_t length = more == 0 ? bytes[1] : 0;
   for (size_t i = 0; i < more; ++i) length = length << 8 | bytes[2 + i];
   return length <= size - 2 - more ? 2 + more + length : 0;

@@ -83,17 +83,25 @@ Command<Options> add(Program& program, const char* name, const char* purpose,
   return Command<Options>(program, program.app, name, purpose, run);
 }
 
+// A word that is no command is named, and not taken for none.
+void require_command(CLI::App& group) {
+  group.require_subcommand(0, 1);
+  group.callback([&group] {
+    if (group.get_subcommands().empty()) throw CLI::RequiredError("A command");
+  });
+}
+
 void add_copy(Program& program) {
   add(program, "copy", "Copy one file between two locations", copy)
-      .needs("FROM", &CopyOptions::from, "a location")
-      .needs("TO", &CopyOptions::to, "another")
+      .needs("FROM", &CopyOptions::from, "a path, or a location as below")
+      .needs("TO", &CopyOptions::to, "the same, or a folder")
       .takes_seconds("--timeout", &CopyOptions::timeout,
                      "how long a server may be silent; without it 30, for mail 300; 0: for ever")
-      .takes_seconds("--max-time", &CopyOptions::max_time, "how long a try may take")
+      .takes_seconds("--max-time", &CopyOptions::max_time, "how long each try may take in all")
       .takes_number("--retries", &CopyOptions::retries, 100,
-                    "how often to try again after a failure of the moment; without it 2")
+                    "how often to try again where that may help; without it 2")
       .flag("--no-clobber", &CopyOptions::no_clobber, "fail where the destination exists")
-      .flag("--in-place", &CopyOptions::in_place, "write over the destination, not beside it")
+      .flag("--in-place", &CopyOptions::in_place, "write over a file that is there instead of replacing it")
       .flag("--sync", &CopyOptions::sync, "wait until the new file is on the disk")
       .takes("--user", &CopyOptions::user, "NAME", "log in at the server as this user")
       .takes("--password-file", &CopyOptions::password_file, "FILE",
@@ -144,7 +152,7 @@ void add_match(Program& program) {
 
 void add_path(Program& program) {
   CLI::App& group = *program.app.add_subcommand("path", "Work out a path");
-  group.require_subcommand(1);
+  require_command(group);
   group.footer(
       "zv path OPERATION --help tells more.\n\n"
       "Example:\n"
@@ -178,9 +186,9 @@ void add_path(Program& program) {
 }
 
 void add_remove(Program& program) {
-  add(program, "rm", "Remove a folder and everything in it", remove)
-      .needs("FOLDER", &RemoveOptions::folder, "neither a root nor . or ..")
-      .flag("--yes", &RemoveOptions::agreed, "ask nothing")
+  add(program, "rm", "Remove a folder and everything in it, after a question", remove)
+      .needs("FOLDER", &RemoveOptions::folder, "a folder, but no root, . or ..")
+      .flag("--yes", &RemoveOptions::agreed, "ask nothing, as a script must")
       .ends_with("Example:\n  zv rm old/album --yes");
 }
 
@@ -211,7 +219,8 @@ int run_command_line(int argc, char** argv) {
   program.app.allow_windows_style_options(false);  // "/x" is a path here on every platform
   program.app.set_version_flag("--version", std::string("zv ") + zarvo_version(),
                                "Print the version and exit");
-  program.app.require_subcommand(1);
+  program.app.get_formatter()->label("SUBCOMMAND", "COMMAND");
+  require_command(program.app);
   program.app.footer("zv COMMAND --help tells more, with examples.");
   for (const auto add_command :
        {add_copy, add_scan, add_match, add_path, add_remove, add_plugins, add_info})
