@@ -8,6 +8,7 @@
 
 #include "frame/byte_map.h"
 #include "platform/platform.h"
+#include "strings/find.h"
 #include "strings/hash.h"
 
 namespace zv {
@@ -36,11 +37,15 @@ uint64_t lower_ascii(uint64_t word) {
   return word | (from_a & ~above_z & ~word & 0x80 * each) >> 2;
 }
 
-bool holds(std::string_view values, std::string_view value) {
-  while (!values.empty()) {
-    const size_t size = values.find('\0');
-    if (std::string_view(values.data(), size) == value) return true;
-    values.remove_prefix(size + 1);
+// Looks for the value and its NUL, which nothing but the end of a value can be.
+bool holds(std::string_view values, const char* value) {
+  const std::string_view wanted(value, std::strlen(value) + 1);
+  const char* const start = values.data();
+  const char* const end = start + values.size();
+  for (const char* place = start; place != end; ++place) {
+    place = find({place, static_cast<size_t>(end - place)}, wanted);
+    if (place == nullptr) return false;
+    if (place == start || place[-1] == '\0') return true;
   }
   return false;
 }
@@ -91,7 +96,7 @@ bool VariableTable::set(std::string_view name, std::string_view value) {
   return false;
 }
 
-bool VariableTable::append(std::string_view name, std::string_view value) {
+bool VariableTable::append(std::string_view name, const char* value) {
   Variable** const found = find(name);
   if (found == nullptr) return make(name, value);
   return holds((*found)->all_values(), value) || add_value(found, value);

@@ -26,7 +26,7 @@ class VariableTable {
 
   // Makes the variable, or adds a value to it unless it holds that one. False when memory ran out,
   // and the table is as it was.
-  [[nodiscard]] bool append(std::string_view name, std::string_view value);
+  [[nodiscard]] bool append(std::string_view name, const char* value);
 
   void remove(std::string_view name);
   void clear();
