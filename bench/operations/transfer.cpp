@@ -103,7 +103,9 @@ struct Files {
   size_t size;
 };
 
-constexpr Files all_files[] = {{"512 MiB", 1, 512 * kib* kib}, {"4 KiB x 500", 500, 4 * kib}};
+constexpr Files large = {"512 MiB", 1, 512 * kib* kib};
+constexpr Files small = {"4 KiB x 500", 500, 4 * kib};
+constexpr Files more = {"4 KiB x 1,000", 1000, 4 * kib};
 
 // A retrieval fails when a server's first and last reply arrive together; then it is tried again.
 int retries = 0;
@@ -246,13 +248,13 @@ void measure(Runner& runner) {
   const std::string http = "http://127.0.0.1:" + told("HTTP_PORT") + "/bench/";
   const std::string ftp = "ftp://" + told("USER") + ":" + told("PASSWORD") +
                           "@127.0.0.1:" + told("FTP_PORT") + "/pub/bench/";
-  for (const Files& files : all_files) {
+  for (const Files& files : {large, small}) {
     measure_ways(runner, "HTTP", http, told("HTTP_ROOT") + "/bench", files);
     // Without root there is no FTP server.
     if (!told("FTP_PORT").empty())
       measure_ways(runner, "FTP", ftp, told("FTP_HOME") + "/pub/bench", files);
-    measure_encrypted(runner, files);
   }
+  for (const Files& files : {large, more}) measure_encrypted(runner, files);
   measure_mail(runner);
 }
 
