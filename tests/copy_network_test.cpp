@@ -145,6 +145,9 @@ TEST(Ftp, RepliesTakenApart) {
     for (const bool good : {true, false})
       for (const char* const said : good ? c.good : c.bad)
         EXPECT_EQ(download(DialogueServer(steps_with(c.place, said))), good ? 0 : -3) << said;
+  Steps nothing = steps_with(retrieval, "150 (0 bytes)");
+  nothing[data].said = "";
+  EXPECT_EQ(download(DialogueServer(nothing)), -3);
 }
 
 TEST(Ftp, ALineThatContinuesIsWaitedBehind) {

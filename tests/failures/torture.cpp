@@ -13,8 +13,6 @@
 #include <cstdlib>
 #include <string>
 #include <thread>
-#include <tuple>
-#include <utility>
 
 #include "failures/failing_calls.h"
 #include "fixtures/peer.h"
@@ -23,6 +21,7 @@
 namespace {
 
 using namespace failing;
+using std::chrono::steady_clock;
 
 // A test with more calls has as many of them fail, evenly spread; fewer where it takes its time,
 // and none where it mostly waits.
@@ -33,13 +32,6 @@ constexpr std::chrono::milliseconds patience(400);
 std::array<char, 300> point;  // what is being tried
 std::atomic<int> points = 0;
 int faults = 0;
-bool gave_up = false;
-
-struct Watcher : testing::EmptyTestEventListener {
-  void OnTestPartResult(const testing::TestPartResult& result) override {
-    if (result.fatally_failed()) gave_up = true;
-  }
-};
 
 [[noreturn]] void die(const char* how) {
   std::fprintf(stderr, "%s: %s\n", how, point.data());
@@ -60,44 +52,40 @@ void clear_tables() {
   zv_pathmap_clear();
 }
 
-// Gives the number of calls met, and whether one failed.
-std::pair<int, bool> run_with(std::string_view call, int error, int skipped) {
+void run_with(Attempt& attempt, const testing::TestInfo& test) {
+  std::snprintf(point.data(), point.size(), "%s.%s, %s call %d, error %d", test.test_suite_name(),
+                test.name(), attempt.call.data(), attempt.left, attempt.error);
   ++points;
-  gave_up = false;
   clear_tables();
   const int blocks = blocks_in_use();
   const int handles = scripted::open_handles();
-  Attempt attempt(call, error, skipped);
   attempt([] { return RUN_ALL_TESTS(); });
   clear_tables();
   const int kept = blocks_in_use() - blocks;
   const int open = scripted::open_handles() - handles;
   // A test that gave up leaves it all behind.
-  if (!gave_up && (kept != 0 || open != 0)) {
-    std::fprintf(stderr, "%d blocks and %d handles lost: %s, %s\n", kept, open, point.data(),
-                 std::string(attempt.failed).c_str());
-    ++faults;
-  }
-  return {attempt.met, !attempt.failed.empty()};
+  if (test.result()->HasFatalFailure() || (kept == 0 && open == 0)) return;
+  std::fprintf(stderr, "%d blocks and %d handles lost: %s, %s\n", kept, open, point.data(),
+               std::string(attempt.failed).c_str());
+  ++faults;
 }
 
-void torture(const std::string& test, std::string_view call, int error) {
-  const auto attempt_at = [&](int skipped) {
-    std::snprintf(point.data(), point.size(), "%s, %s call %d, error %d", test.c_str(), call.data(),
-                  skipped, error);
-    return run_with(call, error, skipped);
-  };
-  GTEST_FLAG_SET(filter, test);
-  const auto begin = std::chrono::steady_clock::now();
-  const int calls = attempt_at(1 << 30).first;
-  const auto taken = std::chrono::steady_clock::now() - begin;
+void torture(const testing::TestInfo& test, std::string_view call, int error) {
+  const auto begin = steady_clock::now();
+  Attempt none(call, error, 1 << 30);
+  run_with(none, test);
+  const auto taken = steady_clock::now() - begin;
   if (taken > 5 * patience) {
-    std::printf("%s takes too long for it\n", test.c_str());
+    std::printf("%s takes too long for it\n", point.data());
     return;
   }
-  const int step = 1 + calls / std::clamp(static_cast<int>(patience / taken), 3, most_points);
-  for (int skipped = 0; attempt_at(skipped).second; skipped += step)
-    if (std::chrono::steady_clock::now() - begin > 10 * patience) return;
+  const int step = 1 + none.met / std::clamp(static_cast<int>(patience / taken), 3, most_points);
+  bool failed = true;
+  for (int skipped = 0; failed && steady_clock::now() - begin < 10 * patience; skipped += step) {
+    Attempt attempt(call, error, skipped);
+    run_with(attempt, test);
+    failed = !attempt.failed.empty();
+  }
 }
 
 }  // namespace
@@ -108,7 +96,6 @@ int main(int argc, char** argv) {
   const std::string wanted = argc > 1 ? argv[1] : "";
   if (wanted.empty()) delete listeners.Release(listeners.default_result_printer());
   delete listeners.Release(listeners.default_xml_generator());
-  listeners.Append(new Watcher);
   for (const int sign : {SIGSEGV, SIGABRT, SIGFPE}) std::signal(sign, [](int) { die("crash"); });
   std::thread(watch).detach();
 
@@ -117,8 +104,10 @@ int main(int argc, char** argv) {
   for (int i = 0; i < all.total_test_suite_count(); ++i) {
     const testing::TestSuite& suite = *all.GetTestSuite(i);
     for (int j = 0; j < suite.total_test_count(); ++j) {
-      const std::string test = suite.name() + std::string(".") + suite.GetTestInfo(j)->name();
-      if (test.find(wanted) == test.npos) continue;
+      const testing::TestInfo& test = *suite.GetTestInfo(j);
+      const std::string name = std::string(suite.name()) + "." + test.name();
+      if (name.find(wanted) == name.npos) continue;
+      GTEST_FLAG_SET(filter, name);
       torture(test, all_memory, ENOMEM);
 #ifndef _WIN32
       torture(test, all_calls, EIO);
