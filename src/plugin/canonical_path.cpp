@@ -1,4 +1,4 @@
-// See canonical_path.h.
+// A path made absolute and normalised, as plugins are compared and loaded by it.
 #include "plugin/canonical_path.h"
 
 #include <cstring>

@@ -1,4 +1,4 @@
-// See error_text.h.
+// The words for why there is no plugin.
 #include "plugin/error_text.h"
 
 #include "zarvo.h"

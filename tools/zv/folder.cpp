@@ -1,4 +1,4 @@
-// See folder.h.
+// Folders as the commands look at them: whether one can be looked into, and what it holds.
 #include "folder.h"
 
 #include <algorithm>

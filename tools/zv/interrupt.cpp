@@ -1,4 +1,4 @@
-// See interrupt.h.
+// Ctrl-C and its like while a transfer runs: the first cancels, the second ends the program.
 #include "interrupt.h"
 
 #include <atomic>

@@ -1,4 +1,4 @@
-// See json.h.
+// Results as JSON (RFC 8259): bytes that are no UTF-8 as lone surrogates.
 #include "json.h"
 
 #include <cstdio>

@@ -1,4 +1,4 @@
-// See location_text.h.
+// Locations as the tool reads and shows them: a folder as destination, a password in no message.
 #include "location_text.h"
 
 #include <algorithm>

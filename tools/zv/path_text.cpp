@@ -1,4 +1,4 @@
-// See path_text.h.
+// A path in the room that the library's in-place operations need.
 #include "path_text.h"
 
 #include "commands.h"

@@ -1,4 +1,4 @@
-// See progress.h.
+// How a copy goes, in one line that is written over again, on a terminal only.
 #include "progress.h"
 
 #include <algorithm>

@@ -1,4 +1,4 @@
-// See system.h. On Linux.
+// What the tool asks of the system, on Linux.
 #include <dlfcn.h>
 #include <sys/mman.h>
 #include <unistd.h>

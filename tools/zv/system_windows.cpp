@@ -1,4 +1,4 @@
-// See system.h. On Windows.
+// What the tool asks of the system, on Windows.
 #include <fcntl.h>
 #include <io.h>
 #include <sys/stat.h>

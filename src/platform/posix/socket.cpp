@@ -1,5 +1,4 @@
 // Stream sockets over IPv4.
-#include <netdb.h>
 #include <netinet/in.h>
 #include <netinet/tcp.h>
 #include <poll.h>
@@ -8,29 +7,12 @@
 
 #include <cerrno>
 #include <cstring>
-#include <memory>
 
-#include "platform/platform.h"
+#include "platform/socket_address.h"
 
 namespace zv::platform {
 
 namespace {
-
-struct FreeAddresses {
-  void operator()(addrinfo* list) const { freeaddrinfo(list); }
-};
-
-using AddressList = std::unique_ptr<addrinfo, FreeAddresses>;
-
-// The thread-safe look-up. Not empty unless it is nullptr.
-AddressList look_up(const char* host, int flags) {
-  addrinfo hints = {};
-  hints.ai_family = AF_INET;
-  hints.ai_socktype = SOCK_STREAM;
-  hints.ai_flags = flags;
-  addrinfo* list = nullptr;
-  return AddressList(getaddrinfo(host, nullptr, &hints, &list) == 0 ? list : nullptr);
-}
 
 // Calls again for as long as a signal interrupts it.
 template <class Call>
@@ -104,7 +86,7 @@ int send_buffer_size(Socket socket) {
 }
 
 bool resolve_name(const char* host, Address& out) {
-  const AddressList list = look_up(host, 0);
+  const AddressList list = look_up(host, AF_INET, 0);
   if (list == nullptr) return false;
   sockaddr_in first = {};
   std::memcpy(&first, list->ai_addr, sizeof first);
@@ -116,7 +98,7 @@ bool official_host_name(TextBuffer<256>& out) {
   TextBuffer<256> name;
   if (!name.fill([](char* room, size_t size) { return gethostname(room, size) == 0; }))
     return false;
-  const AddressList list = look_up(name.c_str(), AI_CANONNAME);
+  const AddressList list = look_up(name.c_str(), AF_INET, AI_CANONNAME);
   return list != nullptr && list->ai_canonname != nullptr && out.assign(list->ai_canonname);
 }
 

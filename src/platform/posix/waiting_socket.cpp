@@ -1,8 +1,6 @@
 // Stream sockets that never wait in a call, over IPv6 and IPv4.
 #include <arpa/inet.h>
 #include <linux/sockios.h>
-#include <netdb.h>
-#include <netinet/in.h>
 #include <netinet/tcp.h>
 #include <poll.h>
 #include <sys/ioctl.h>
@@ -10,76 +8,12 @@
 #include <unistd.h>
 
 #include <cerrno>
-#include <cstring>
-#include <memory>
 
-#include "platform/platform.h"
+#include "platform/socket_address.h"
 
 namespace zv::platform {
 
-namespace {
-
-struct FreeAddresses {
-  void operator()(addrinfo* list) const { freeaddrinfo(list); }
-};
-
-using AddressList = std::unique_ptr<addrinfo, FreeAddresses>;
-
-// Not empty unless it is nullptr.
-AddressList look_up(const char* host, int family, int flags) {
-  addrinfo hints = {};
-  hints.ai_family = family;
-  hints.ai_socktype = SOCK_STREAM;
-  hints.ai_flags = flags;
-  addrinfo* list = nullptr;
-  return AddressList(getaddrinfo(host, nullptr, &hints, &list) == 0 ? list : nullptr);
-}
-
-bool from_system(const sockaddr* address, HostAddress& out) {
-  out = {};
-  if (address->sa_family == AF_INET) {
-    sockaddr_in four;
-    std::memcpy(&four, address, sizeof four);
-    std::memcpy(out.bytes.data(), &four.sin_addr, sizeof four.sin_addr);
-    return true;
-  }
-  if (address->sa_family != AF_INET6) return false;
-  sockaddr_in6 six;
-  std::memcpy(&six, address, sizeof six);
-  out.is_six = true;
-  std::memcpy(out.bytes.data(), &six.sin6_addr, sizeof six.sin6_addr);
-  out.scope = six.sin6_scope_id;
-  return true;
-}
-
-socklen_t to_system(const HostAddress& address, unsigned port, sockaddr_storage& out) {
-  out = {};
-  if (!address.is_six) {
-    sockaddr_in four = {};
-    four.sin_family = AF_INET;
-    four.sin_port = htons(static_cast<uint16_t>(port));
-    std::memcpy(&four.sin_addr, address.bytes.data(), sizeof four.sin_addr);
-    std::memcpy(&out, &four, sizeof four);
-    return sizeof four;
-  }
-  sockaddr_in6 six = {};
-  six.sin6_family = AF_INET6;
-  six.sin6_port = htons(static_cast<uint16_t>(port));
-  six.sin6_scope_id = address.scope;
-  std::memcpy(&six.sin6_addr, address.bytes.data(), sizeof six.sin6_addr);
-  std::memcpy(&out, &six, sizeof six);
-  return sizeof six;
-}
-
-template <class Ask>
-bool address_of(Socket socket, HostAddress& out, Ask ask) {
-  sockaddr_storage address = {};
-  socklen_t size = sizeof address;
-  auto* const name = reinterpret_cast<sockaddr*>(&address);
-  return ask(static_cast<int>(socket), name, &size) == 0 && from_system(name, out);
-}
-
-}  // namespace
+namespace {}  // namespace
 
 size_t look_up_name(const char* name, std::span<HostAddress> room) {
   if (look_up(name, AF_INET, AI_NUMERICHOST) != nullptr) return 0;
@@ -157,11 +91,11 @@ void socket_reset(Socket socket) {
 }
 
 bool peer_address(Socket socket, HostAddress& out) {
-  return address_of(socket, out, getpeername);
+  return address_of(static_cast<int>(socket), out, getpeername);
 }
 
 bool local_address(Socket socket, HostAddress& out) {
-  return address_of(socket, out, getsockname);
+  return address_of(static_cast<int>(socket), out, getsockname);
 }
 
 int64_t unsent_bytes(Socket socket) {

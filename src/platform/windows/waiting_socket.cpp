@@ -1,80 +1,15 @@
 // Stream sockets that never wait in a call, over IPv6 and IPv4.
-#include <winsock2.h>
-#include <ws2tcpip.h>
-
 #include <cerrno>
 #include <cstdio>
-#include <cstring>
-#include <memory>
 
-#include "platform/platform.h"
+#include "platform/socket_address.h"
 
 namespace zv::platform {
 
 namespace {
 
-struct FreeAddresses {
-  void operator()(addrinfo* list) const { freeaddrinfo(list); }
-};
-
-using AddressList = std::unique_ptr<addrinfo, FreeAddresses>;
-
 SOCKET handle(Socket socket) {
   return static_cast<SOCKET>(socket);
-}
-
-// Not empty unless it is nullptr.
-AddressList look_up(const char* host, int family, int flags) {
-  addrinfo hints = {};
-  hints.ai_family = family;
-  hints.ai_socktype = SOCK_STREAM;
-  hints.ai_flags = flags;
-  addrinfo* list = nullptr;
-  return AddressList(getaddrinfo(host, nullptr, &hints, &list) == 0 ? list : nullptr);
-}
-
-bool from_system(const sockaddr* address, HostAddress& out) {
-  out = {};
-  if (address->sa_family == AF_INET) {
-    sockaddr_in four;
-    std::memcpy(&four, address, sizeof four);
-    std::memcpy(out.bytes.data(), &four.sin_addr, sizeof four.sin_addr);
-    return true;
-  }
-  if (address->sa_family != AF_INET6) return false;
-  sockaddr_in6 six;
-  std::memcpy(&six, address, sizeof six);
-  out.is_six = true;
-  std::memcpy(out.bytes.data(), &six.sin6_addr, sizeof six.sin6_addr);
-  out.scope = six.sin6_scope_id;
-  return true;
-}
-
-int to_system(const HostAddress& address, unsigned port, sockaddr_storage& out) {
-  out = {};
-  if (!address.is_six) {
-    sockaddr_in four = {};
-    four.sin_family = AF_INET;
-    four.sin_port = htons(static_cast<u_short>(port));
-    std::memcpy(&four.sin_addr, address.bytes.data(), sizeof four.sin_addr);
-    std::memcpy(&out, &four, sizeof four);
-    return sizeof four;
-  }
-  sockaddr_in6 six = {};
-  six.sin6_family = AF_INET6;
-  six.sin6_port = htons(static_cast<u_short>(port));
-  six.sin6_scope_id = address.scope;
-  std::memcpy(&six.sin6_addr, address.bytes.data(), sizeof six.sin6_addr);
-  std::memcpy(&out, &six, sizeof six);
-  return sizeof six;
-}
-
-template <class Ask>
-bool address_of(Socket socket, HostAddress& out, Ask ask) {
-  sockaddr_storage address = {};
-  int size = sizeof address;
-  auto* const name = reinterpret_cast<sockaddr*>(&address);
-  return ask(handle(socket), name, &size) == 0 && from_system(name, out);
 }
 
 bool never_waits(SOCKET socket) {
@@ -185,11 +120,11 @@ void socket_reset(Socket socket) {
 }
 
 bool peer_address(Socket socket, HostAddress& out) {
-  return address_of(socket, out, getpeername);
+  return address_of(handle(socket), out, getpeername);
 }
 
 bool local_address(Socket socket, HostAddress& out) {
-  return address_of(socket, out, getsockname);
+  return address_of(handle(socket), out, getsockname);
 }
 
 int64_t unsent_bytes(Socket) {
