@@ -125,47 +125,38 @@ TEST(Handle, HttpAnswers) {
 }
 
 TEST(Copy, HttpAnswers) {
-  struct Case {
-    int result;
-    std::string content;
-    std::vector<std::string> responses;
-    std::string slowly = "";  // sent after the response, byte by byte
-  };
-  const std::string five = "Content-Length: 5\r\n\r\nhello";
-  const std::string large = repeated("large", 300000);
-  const Case cases[] = {
-      {0,
-       "hello",
-       {ok + five, "http/1.1 299 x\r\nServer: y\r\ncontent-length: 5\r\n\r\nhello",
-        "HTTP/1.0 200 OK\nServer: y\r\n" + five, "\nHTTP/1.0 204 \r\n" + five,
-        length + "  5 x\r\nContent-Length: 8\r\n\r\nhello"}},
-      {0, "a\r\n\r\nb", {length + "6\r\n\r\na\r\n\r\nb"}},
-      {0, large, {length + "1500000\r\n\r\n" + large}},
-      {0, std::string(40, 'x'), {length + "40\r\n\r\n"}, std::string(40, 'x')},
-      {-3,
-       "hello",
-       {length + "6\r\n\r\nhello", length + "4\r\n\r\nhello",
-        length + "9223372036854775807\r\n\r\nhello"}},
-      {-3, large, {length + "1500001\r\n\r\n" + large}},
-      {-3,
-       "",
-       {length + "9223372036854775808\r\n\r\nhello", length + "0\r\n\r\n",
-        length + "-5\r\n\r\nhello", ok + "Content-Length:5\r\n\r\nhello", ok + "X-" + five,
-        ok + "\r\nhello", ok + "Content-Length: 5\r\n", "HTTP/1.0 199 x\r\n" + five,
-        "HTTP/1.0 300 x\r\n" + five, "HTTP/1.0 4294967496 x\r\n" + five,
-        "HTTP/1.0 OK 200\r\n" + five, "HTTP/1.0\r\n" + five, "ICY 200 OK\r\n" + five, "HTT\r\n\r\n",
-        "\r\n\r\n", ""}},
-  };
-  const ScratchFolder folder;
-  for (const auto& [result, content, responses, slowly] : cases) {
-    for (const std::string& response : responses) {
-      SCOPED_TRACE(response.substr(0, 60));
+  const auto check = [](int result, const std::string& content,
+                        std::initializer_list<std::string> answers,
+                        const std::string& slowly = "") {
+    for (const std::string& answer : answers) {
+      SCOPED_TRACE(answer.substr(0, 60));
+      const ScratchFolder folder;
       const Fault fault = slowly.empty() ? Fault::none : Fault::bytewise;
-      DialogueServer server({{"GET", response}, {unasked, slowly}}, fault, 1);
+      DialogueServer server({{"GET", answer}, {unasked, slowly}}, fault, 1);
       EXPECT_EQ(copy(server.url("http", "/f"), folder.path("got")), result);
       EXPECT_TRUE(folder.content("got") == content);
     }
-  }
+  };
+  const std::string five = "Content-Length: 5\r\n\r\nhello";
+  const std::string large = repeated("large", 300000);
+  check(0, "hello",
+        {ok + five, "http/1.1 299 x\r\nServer: y\r\ncontent-length: 5\r\n\r\nhello",
+         "HTTP/1.0 200 OK\nServer: y\r\n" + five, "\nHTTP/1.0 204 \r\n" + five,
+         length + "  5 x\r\nContent-Length: 8\r\n\r\nhello"});
+  check(0, "a\r\n\r\nb", {length + "6\r\n\r\na\r\n\r\nb"});
+  check(0, large, {length + "1500000\r\n\r\n" + large});
+  check(0, std::string(40, 'x'), {length + "40\r\n\r\n"}, std::string(40, 'x'));
+  check(-3, large, {length + "1500001\r\n\r\n" + large});
+  check(-3, "hello",
+        {length + "6\r\n\r\nhello", length + "4\r\n\r\nhello",
+         length + "9223372036854775807\r\n\r\nhello"});
+  check(-3, "",
+        {length + "9223372036854775808\r\n\r\nhello", length + "0\r\n\r\n",
+         length + "-5\r\n\r\nhello", ok + "Content-Length:5\r\n\r\nhello", ok + "X-" + five,
+         ok + "\r\nhello", ok + "Content-Length: 5\r\n", "HTTP/1.0 199 x\r\n" + five,
+         "HTTP/1.0 300 x\r\n" + five, "HTTP/1.0 4294967496 x\r\n" + five,
+         "HTTP/1.0 OK 200\r\n" + five, "HTTP/1.0\r\n" + five, "ICY 200 OK\r\n" + five,
+         "HTT\r\n\r\n", "\r\n\r\n", ""});
 }
 
 // After a body that came with its header the server has to close; too much is not waited for.

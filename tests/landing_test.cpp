@@ -42,17 +42,13 @@ int copy(const Option& option, const std::string& from, const std::string& to) {
   return outcome_of(new_handle({option}), from, to).code;
 }
 
-struct Case {
-  Option option;
-  Outcome end;
-  std::vector<std::string> destinations;
-  std::string from = "new";  // which holds "content"
-};
+struct Landing : testing::Test {
+  const ScratchFolder folder;
 
-// What succeeds leaves the source's content, what fails what was there.
-void run_cases(const ScratchFolder& folder, std::initializer_list<Case> cases) {
-  for (const auto& [option, end, destinations, from] : cases) {
-    for (const std::string& name : destinations) {
+  // From a file, "new" as a rule. What succeeds leaves its content, what fails what was there.
+  void check(const Option& option, const Outcome& end, std::initializer_list<std::string> places,
+             const std::string& from = "new") const {
+    for (const std::string& name : places) {
       SCOPED_TRACE(from + " to " + name);
       const std::string to = folder.path(name);
       std::error_code none;
@@ -67,10 +63,9 @@ void run_cases(const ScratchFolder& folder, std::initializer_list<Case> cases) {
         EXPECT_FALSE(entry.path().filename().string().starts_with(".zv-"));
     }
   }
-}
+};
 
-TEST(Landing, WhatIsThere) {
-  const ScratchFolder folder;
+TEST_F(Landing, WhatIsThere) {
   for (const char* const name : {"old", "linked", "folder/old"})
     folder.make_file(name, "what was there before");
   folder.make_file("new", "content");
@@ -80,25 +75,25 @@ TEST(Landing, WhatIsThere) {
   std::string longest = "folder/";
   while (folder.path(longest).size() < 317) longest += "./";
   longest += "x";
-  run_cases(folder, {{plain, landed, {"made", "folder/made"}},
-                     {plain, landed, {"made"}, "empty"},
-                     {sync_it, landed, {"old", "folder/synced"}},
-                     {in_place, landed, {"made in place", longest}},
-                     {keep, landed, {"kept"}},
-                     {keep, exists, {"kept", "linked"}},
-                     {plain, local(-4, EISDIR), {"folder"}},
-                     {in_place, local(-4, EISDIR), {"folder/"}},
-                     {plain, local(-4, ENOENT), {"missing/x"}},
-                     {plain, {-4, ZV_CAUSE_LOCATION, ENAMETOOLONG}, {longest}},
-                     {plain, same_file, {"new", "new too"}},
-                     {in_place, same_file, {"new", "new too"}},
-                     {plain, refused("ZV_TRANSFER_IN_PLACE"), {"linked"}},
-                     {in_place, landed, {"linked"}},
-                     {plain, local(-3, ENOENT), {"x", "old"}, "missing"},
-                     {plain, local(-3, EISDIR), {"x", "old"}, "folder"},
-                     {{ZV_TRANSFER_SIZE, 6}, too_large, {"x", "old"}},
-                     {{ZV_TRANSFER_SIZE, 7}, landed, {"old"}},
-                     {{ZV_TRANSFER_SIZE, 0}, landed, {"old"}, "empty"}});
+  check(plain, landed, {"made", "folder/made"});
+  check(plain, landed, {"made"}, "empty");
+  check(sync_it, landed, {"old", "folder/synced"});
+  check(in_place, landed, {"made in place", longest});
+  check(keep, landed, {"kept"});
+  check(keep, exists, {"kept", "linked"});
+  check(plain, local(-4, EISDIR), {"folder"});
+  check(in_place, local(-4, EISDIR), {"folder/"});
+  check(plain, local(-4, ENOENT), {"missing/x"});
+  check(plain, {-4, ZV_CAUSE_LOCATION, ENAMETOOLONG}, {longest});
+  check(plain, same_file, {"new", "new too"});
+  check(in_place, same_file, {"new", "new too"});
+  check(plain, refused("ZV_TRANSFER_IN_PLACE"), {"linked"});
+  check(in_place, landed, {"linked"});
+  check(plain, local(-3, ENOENT), {"x", "old"}, "missing");
+  check(plain, local(-3, EISDIR), {"x", "old"}, "folder");
+  check({ZV_TRANSFER_SIZE, 6}, too_large, {"x", "old"});
+  check({ZV_TRANSFER_SIZE, 7}, landed, {"old"});
+  check({ZV_TRANSFER_SIZE, 0}, landed, {"old"}, "empty");
   EXPECT_EQ(folder.content("other name"), "content");
   for (const Outcome& end : {landed, exists})
     expect_end(outcome_of(new_handle({in_place, keep}), folder.path("new"), folder.path("both")),
@@ -106,8 +101,7 @@ TEST(Landing, WhatIsThere) {
 }
 
 // Between two pieces, and after the last one: nothing has landed until it has its name.
-TEST(Landing, Cancelled) {
-  const ScratchFolder folder;
+TEST_F(Landing, Cancelled) {
   const std::string from = folder.make_file("from", std::string(size_t{20} << 20, 'x'));
   const std::string to = folder.make_file("to", "old");
   const auto watch = [](void* stop, int64_t done, int64_t) {
@@ -125,15 +119,14 @@ TEST(Landing, Cancelled) {
 
 #ifdef _WIN32
 
-TEST(Landing, ReadOnlyFiles) {
-  const ScratchFolder folder;
+TEST_F(Landing, ReadOnlyFiles) {
   folder.make_file("new", "content");
   folder.make_file("old", "what was there before");
   fs::permissions(folder.path("old"), fs::perms::owner_read);
-  run_cases(folder, {{plain, refused("ZV_TRANSFER_IN_PLACE"), {"old"}},
-                     {in_place, local(-4, EACCES), {"old"}},
-                     {plain, landed, {"made"}, "old"},
-                     {plain, local(-4, ENOENT), {"made/x", "bad|name"}}});
+  check(plain, refused("ZV_TRANSFER_IN_PLACE"), {"old"});
+  check(in_place, local(-4, EACCES), {"old"});
+  check(plain, landed, {"made"}, "old");
+  check(plain, local(-4, ENOENT), {"made/x", "bad|name"});
   EXPECT_EQ(copy(plain, folder.path("new"), folder.path("nul")), 0);
   for (const char* const name : {"old", "made"}) {
     EXPECT_FALSE(std::ofstream(folder.path(name), std::ios::app));
@@ -143,8 +136,7 @@ TEST(Landing, ReadOnlyFiles) {
 
 #else
 
-TEST(Landing, LinksAndDevices) {
-  const ScratchFolder folder;
+TEST_F(Landing, LinksAndDevices) {
   folder.make_file("new", "content");
   folder.make_file("folder/file", "what was there before");
   const int open_file = ::open(folder.make_file("open").c_str(), O_RDWR | O_CLOEXEC);
@@ -158,19 +150,19 @@ TEST(Landing, LinksAndDevices) {
                                   {"made up", "/proc/version"},
                                   {"open too", "/dev/fd/" + std::to_string(open_file)}};
   for (const auto& [name, target] : links) fs::create_symlink(target, folder.path(name));
-  run_cases(folder, {{plain, landed, {"link to a link", "to folder/made", "null", "open too"}},
-                     {in_place, landed, {"link"}},
-                     {sync_it, landed, {"null"}},
-                     {keep, exists, {"link", "loose", "null"}},
-                     {plain, local(-4, EISDIR), {"to folder"}},
-                     {plain, refused("leads nowhere"), {"loose"}},
-                     {plain, local(-4, ELOOP), {"circle"}},
-                     {plain, local(-4, ENOTDIR), {"new/x"}},
-                     {plain, same_file, {"null"}, "null"},
-                     {plain, same_file, {"open too"}, "open"},
-                     {plain, disk_full, {"full"}},
-                     {plain, landed, {"copied"}, "made up"},
-                     {plain, landed, {"empty"}, "null"}});
+  check(plain, landed, {"link to a link", "to folder/made", "null", "open too"});
+  check(in_place, landed, {"link"});
+  check(sync_it, landed, {"null"});
+  check(keep, exists, {"link", "loose", "null"});
+  check(plain, local(-4, EISDIR), {"to folder"});
+  check(plain, refused("leads nowhere"), {"loose"});
+  check(plain, local(-4, ELOOP), {"circle"});
+  check(plain, local(-4, ENOTDIR), {"new/x"});
+  check(plain, same_file, {"null"}, "null");
+  check(plain, same_file, {"open too"}, "open");
+  check(plain, disk_full, {"full"});
+  check(plain, landed, {"copied"}, "made up");
+  check(plain, landed, {"empty"}, "null");
   EXPECT_TRUE(fs::is_symlink(folder.path("link to a link")) && fs::is_symlink(folder.path("link")));
   EXPECT_TRUE(folder.content("copied").starts_with("Linux"));
   EXPECT_EQ(folder.content("open"), "content");
@@ -178,8 +170,7 @@ TEST(Landing, LinksAndDevices) {
 }
 
 // What a pipe holds passes as it comes, and no limit waits for more of it.
-TEST(Landing, Pipes) {
-  const ScratchFolder folder;
+TEST_F(Landing, Pipes) {
   const std::string pipe = folder.path("pipe");
   const std::string to = folder.path("to");
   ASSERT_EQ(::mkfifo(pipe.c_str(), 0600), 0);
@@ -228,8 +219,7 @@ struct stat status_of(const std::string& path) {
   return st;
 }
 
-TEST(Landing, Rights) {
-  const ScratchFolder folder;
+TEST_F(Landing, Rights) {
   const std::string from = folder.make_file("from", "content");
   const std::string old = folder.make_file("old", "old");
   const std::string made = folder.path("made");
@@ -265,10 +255,9 @@ TEST(Landing, Rights) {
 }
 
 // Files of root, replaced by somebody else.
-TEST(Landing, RightsThatAreMissing) {
+TEST_F(Landing, RightsThatAreMissing) {
   if (::geteuid() != 0) GTEST_SKIP() << "needs root, who can be somebody else for a while";
   constexpr uid_t somebody = 12345;
-  const ScratchFolder folder;
   struct Entry {
     const char* path;
     mode_t bits;
@@ -293,16 +282,16 @@ TEST(Landing, RightsThatAreMissing) {
   const std::string fixed = folder.make_file("fixed", "old");
   const bool is_fixed =
       ::mount(folder.make_file("disk", "old").c_str(), fixed.c_str(), "", MS_BIND, "") == 0;
-  if (is_fixed)
-    run_cases(folder, {{plain, refused("folder"), {"fixed"}}, {in_place, landed, {"fixed"}}});
+  if (is_fixed) check(plain, refused("folder"), {"fixed"});
+  check(in_place, landed, {"fixed"});
   ASSERT_TRUE(::setegid(somebody) == 0 && ::seteuid(somebody) == 0);
-  run_cases(folder, {{plain, landed, {"open/made", "open/write-only"}},
-                     {plain, refused("owner"), {"open/root's", "sticky/root's"}},
-                     {plain, refused("may not be written"), {"open/read-only"}},
-                     {plain, refused("folder"), {"closed/mine"}},
-                     {in_place, landed, {"open/root's", "closed/mine"}},
-                     {in_place, local(-4, EACCES), {"open/read-only"}},
-                     {plain, local(-4, EACCES), {"closed/made"}}});
+  check(plain, landed, {"open/made", "open/write-only"});
+  check(plain, refused("owner"), {"open/root's", "sticky/root's"});
+  check(plain, refused("may not be written"), {"open/read-only"});
+  check(plain, refused("folder"), {"closed/mine"});
+  check(in_place, landed, {"open/root's", "closed/mine"});
+  check(in_place, local(-4, EACCES), {"open/read-only"});
+  check(plain, local(-4, EACCES), {"closed/made"});
   ASSERT_TRUE(::seteuid(0) == 0 && ::setegid(0) == 0);
   ::umount(fixed.c_str());
 }

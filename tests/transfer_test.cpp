@@ -106,47 +106,38 @@ TEST(Handle, LocationsThatAreRefused) {
   const ScratchFolder folder;
   const std::string file = folder.make_file("file", "hello");
   const std::string closed = "127.0.0.1:" + std::to_string(closed_port());
-  struct Case {
-    int cause;
-    std::string reason;
-    std::vector<std::string> locations;
-    int number = 0;
-  };
-  const Case cases[] = {
-      {ZV_CAUSE_LOCATION, "no location", {""}},
-      {ZV_CAUSE_LOCATION, ":// is not spoken", {"gopher://h/x", "a+b-1.c://h/x"}},
-      {ZV_CAUSE_LOCATION, "no path", {"http://h", "file://"}},
-      {ZV_CAUSE_LOCATION,
-       "no usable host",
-       {"http:///x", "ftp://a b/x", "ftp://::1/x", "ftp://[::1]x/f"}},
-      {ZV_CAUSE_LOCATION, "no usable port", {"ftp://h:0/x", "ftp://h:65536/x"}},
-      {ZV_CAUSE_LOCATION, "no usable port", {"ftp://h:+21/x", "ftp://h:21x/x"}},
-      {ZV_CAUSE_LOCATION, "no IPv6 address", {"ftp://[::g]/x", "ftp://[127.0.0.1]/x"}},
-      {ZV_CAUSE_LOCATION, "a %00", {"ftp://h/a%00b", "file://a%00b"}},
-      {ZV_CAUSE_LOCATION, "a line end", {"ftp://h/a%0Db", "ftp://h/a\nb", "ftp://u%0a@h/f"}},
-      {ZV_CAUSE_LOCATION, "a user with a colon", {"http://a%3Ab@h/f"}},
-      {ZV_CAUSE_LOCATION, "not an address", {"smtp://" + closed + "/", "smtp://h/r%20x"}},
-      {ZV_CAUSE_LOCATION, "not an address", {"smtp://h/<r", "smtp://h/r>", "smtp://h/r\xc3\xa4@x"}},
-      {ZV_CAUSE_LOCATION, "not an address", {"smtp://h/" + std::string(255, 'r')}},
-      {ZV_CAUSE_LOCATION, "not an address: r????~", {"smtp://h/r%1b%c2%9b%7f~"}},
-      {ZV_CAUSE_LOCATION, "the sender has no usable address", {"smtp://u x@d@h/r"}},
-      {ZV_CAUSE_LOOKUP, "look up ", {"http://no-such-host.invalid/f", "http://127.1/f"}},
-      {ZV_CAUSE_LOOKUP, "look up ", {"http://127.0.0.256/f", "http://0x7f000001/f"}},
-      {ZV_CAUSE_CONNECT, closed + ": Connection refused", {"ftp://" + closed + "/f"}, ECONNREFUSED},
-  };
   const HandlePtr handle = new_handle();
-  for (const auto& [cause, reason, locations, number] : cases) {
+  const auto check = [&](int cause, const std::string& reason,
+                         std::initializer_list<std::string> locations, int number = 0) {
     for (const std::string& location : locations) {
       SCOPED_TRACE(location.substr(0, 40));
       expect_end(outcome_of(handle, file, location), {-4, cause, number, reason});
-      const Outcome as_source = outcome_of(handle, location, folder.path("new"));
-      if (location.starts_with("smtp"))
-        expect_end(as_source, {-3, cause, 0, "a mail is no source"});
-      else
-        expect_end(as_source, {-3, cause, number, reason});
+      const std::string as_source = location.starts_with("smtp") ? "a mail is no source" : reason;
+      expect_end(outcome_of(handle, location, folder.path("new")), {-3, cause, number, as_source});
       EXPECT_FALSE(folder.exists("new"));
     }
-  }
+  };
+  check(ZV_CAUSE_LOCATION, "no location", {""});
+  check(ZV_CAUSE_LOCATION, ":// is not spoken", {"gopher://h/x", "a+b-1.c://h/x"});
+  check(ZV_CAUSE_LOCATION, "no path", {"http://h", "file://"});
+  check(ZV_CAUSE_LOCATION, "no usable host",
+        {"http:///x", "ftp://a b/x", "ftp://::1/x", "ftp://[::1]x/f"});
+  check(ZV_CAUSE_LOCATION, "no usable port", {"ftp://h:0/x", "ftp://h:65536/x"});
+  check(ZV_CAUSE_LOCATION, "no usable port", {"ftp://h:+21/x", "ftp://h:21x/x"});
+  check(ZV_CAUSE_LOCATION, "no IPv6 address", {"ftp://[::g]/x", "ftp://[127.0.0.1]/x"});
+  check(ZV_CAUSE_LOCATION, "a %00", {"ftp://h/a%00b", "file://a%00b"});
+  check(ZV_CAUSE_LOCATION, "a line end", {"ftp://h/a%0Db", "ftp://h/a\nb", "ftp://u%0a@h/f"});
+  check(ZV_CAUSE_LOCATION, "a user with a colon", {"http://a%3Ab@h/f"});
+  check(ZV_CAUSE_LOCATION, "not an address", {"smtp://" + closed + "/", "smtp://h/r%20x"});
+  check(ZV_CAUSE_LOCATION, "not an address",
+        {"smtp://h/<r", "smtp://h/r>", "smtp://h/r\xc3\xa4@x"});
+  check(ZV_CAUSE_LOCATION, "not an address", {"smtp://h/" + std::string(255, 'r')});
+  check(ZV_CAUSE_LOCATION, "not an address: r????~", {"smtp://h/r%1b%c2%9b%7f~"});
+  check(ZV_CAUSE_LOCATION, "the sender has no usable address", {"smtp://u x@d@h/r"});
+  check(ZV_CAUSE_LOOKUP, "look up ", {"http://no-such-host.invalid/f", "http://127.1/f"});
+  check(ZV_CAUSE_LOOKUP, "look up ", {"http://127.0.0.256/f", "http://0x7f000001/f"});
+  check(ZV_CAUSE_CONNECT, closed + ": Connection refused", {"ftp://" + closed + "/f"},
+        ECONNREFUSED);
 }
 
 TEST(Handle, OptionsAndTheirRanges) {
