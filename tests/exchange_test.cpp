@@ -287,6 +287,7 @@ TEST(Handle, FtpReplies) {
         {"SIZE:213 9223372036854775808", "SIZE:213 -5"});
   check("ftp", ZV_CAUSE_TOO_LARGE, "larger", {"SIZE:213 5", "SIZE:550 no"}, {ZV_TRANSFER_SIZE, 4});
   check("ftp", ZV_CAUSE_NONE, "hello", {"SIZE:213 5", "SIZE:550 no"}, {ZV_TRANSFER_SIZE, 5});
+  check("ftp", ZV_CAUSE_NONE, "hello", {"SIZE:213 5"}, {ZV_TRANSFER_TIME, -1});
   check("ftp", ZV_CAUSE_REFUSED, "RETR /f: ", {"RETR:550 No such file.", "RETR:500 pw"});
   check("ftp", ZV_CAUSE_REFUSED_NOW, "RETR /f: ", {"RETR:450 busy"});
   check("ftp", ZV_CAUSE_PROTOCOL, "RETR /f: a reply without a code", {"RETR:999 what"});
