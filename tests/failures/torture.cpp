@@ -76,7 +76,7 @@ void torture(const testing::TestInfo& test, std::string_view call, int error) {
   run_with(none, test);
   const auto taken = steady_clock::now() - begin;
   if (taken > 5 * patience) {
-    std::printf("%s takes too long for it\n", point.data());
+    std::printf("%s.%s takes too long for it\n", test.test_suite_name(), test.name());
     return;
   }
   const int step = 1 + none.met / std::clamp(static_cast<int>(patience / taken), 3, most_points);
