@@ -29,9 +29,14 @@ as_root() {
     fi
 }
 
+# A name may end with an architecture, as in libssl-dev:arm64.
 missing_packages() {
-    dpkg-query -W -f '${db:Status-Status} ${Package}\n' "$@" 2>/dev/null |
-        sed -n 's/^installed //p' | sort | comm -13 - <(printf '%s\n' "$@" | sort)
+    local own
+    own=$(dpkg --print-architecture)
+    dpkg-query -W -f '${db:Status-Status} ${Package} ${Architecture}\n' "$@" 2>/dev/null |
+        awk -v own="$own" '$1 == "installed" { print $2 ":" $3
+            if ($3 == own || $3 == "all") print $2 }' |
+        sort | comm -13 - <(printf '%s\n' "$@" | sort)
 }
 
 # A server's package must start no service: the tests start their own servers, on loopback.
@@ -45,6 +50,11 @@ install_without_services() (
     as_root env DEBIAN_FRONTEND=noninteractive apt-get -q -y -o DPkg::Lock::Timeout=300 \
         install --no-install-recommends "$@"
 )
+
+# Lets packages of another architecture be installed.
+need_architecture() {
+    dpkg --print-foreign-architectures | grep -qx "$1" || as_root dpkg --add-architecture "$1"
+}
 
 need_packages() {
     command -v apt-get >/dev/null || return 0 # another system: its user has brought the tools

@@ -101,7 +101,8 @@ void add_copy(Program& program) {
       .takes_number("--retries", &CopyOptions::retries, 100,
                     "how often to try again where that may help; without it 2")
       .flag("--no-clobber", &CopyOptions::no_clobber, "fail where the destination exists")
-      .flag("--in-place", &CopyOptions::in_place, "write over a file that is there instead of replacing it")
+      .flag("--in-place", &CopyOptions::in_place,
+            "write over a file that is there instead of replacing it")
       .flag("--sync", &CopyOptions::sync, "wait until the new file is on the disk")
       .takes("--user", &CopyOptions::user, "NAME", "log in at the server as this user")
       .takes("--password-file", &CopyOptions::password_file, "FILE",
