@@ -13,8 +13,7 @@ from pathlib import Path
 
 from installed import WARNINGS, Installed, run
 
-WINDOWS_OWN = {"kernel32.dll", "msvcrt.dll", "advapi32.dll", "ws2_32.dll", "crypt32.dll",
-               "secur32.dll"}
+WINDOWS_OWN = {f"{name}.dll" for name in "kernel32 msvcrt advapi32 ws2_32 crypt32 secur32".split()}
 
 
 class Package(unittest.TestCase):
@@ -40,13 +39,12 @@ class Package(unittest.TestCase):
     def test_examples(self):
         """They are a project of its own, whose host finds its plugins."""
         programs = self.installed.build_with_cmake(args.source / "examples")
-        suffix = ".exe" if args.windows else ""
-        if not (programs / f"make_samples{suffix}").exists():
+        host, samples = (programs / (name + ".exe" * args.windows) for name in ("gallery", "make_samples"))
+        if not samples.exists():
             self.skipTest("there is no stb here")
-        self.installed.run_program(programs / f"make_samples{suffix}", "pictures")
-        self.assertRegex(self.installed.run_program(
-            programs / f"gallery{suffix}", programs.parent / "gallery_plugins", "pictures",
-            "sheet.png"), r"Tiles\.BMP +Windows bitmap +240 x 160")
+        self.installed.run_program(samples, "pictures")
+        words = [programs.parent / "gallery_plugins", "pictures", "sheet.png"]
+        self.assertRegex(self.installed.run_program(host, *words), r"Tiles\.BMP +Windows bitmap +240 x 160")
 
     def test_inside_another_tree(self):
         """The library's own tests and programs are none of an including program's targets."""
@@ -85,19 +83,17 @@ class Package(unittest.TestCase):
         self.assertEqual(sorted(exported), sorted(self.declared))
 
     def test_hardening(self):
-        programs = [self.library, self.prefix / ("bin/zv.exe" if args.windows else "bin/zv")]
-        for file in programs + [self.encryption] * self.encryption.exists():
-            if args.windows:
-                text = run(args.objdump, "-p", "-t", file)
-                wanted = ["HIGH_ENTROPY_VA", "DYNAMIC_BASE", "NX_COMPAT", "__stack_chk_fail"]
-            else:
-                text = run("readelf", "-dhlW", "--dyn-syms", file)
-                wanted = [r"\bDYN\b", r"GNU_RELRO", r"\bNOW\b", r"UND __stack_chk_fail",
-                          r"GNU_STACK\s+(0x\w+\s+){5}RW "]
-                self.assertNotIn("TEXTREL", text)
-                if file == self.library:  # the calls that the tool makes differ by compiler
-                    wanted.append(r"UND __mem\w+_chk@")
+        shown = [args.objdump, "-p", "-t"] if args.windows else ["readelf", "-dhlW", "--dyn-syms"]
+        wanted = ["HIGH_ENTROPY_VA", "DYNAMIC_BASE", "NX_COMPAT", "__stack_chk_fail"] if args.windows \
+            else [r"\bDYN\b", "GNU_RELRO", r"\bNOW\b", "UND __stack_chk_fail",
+                  r"GNU_STACK\s+(0x\w+\s+){5}RW "]
+        for file in [self.library, self.prefix / ("bin/zv.exe" if args.windows else "bin/zv"),
+                     *[self.encryption] * self.encryption.exists()]:
+            text = run(*shown, file)
             self.assertEqual([word for word in wanted if not re.search(word, text)], [], file.name)
+            self.assertNotIn("TEXTREL", text)
+        if not args.windows:
+            self.assertRegex(run(*shown, self.library), r"UND __mem\w+_chk@")
         # Every exported function begins with a mark that it may be jumped to.
         code = run(args.objdump, "-d", "--no-show-raw-insn", self.library)
         if "%rsp" in code:  # of the processors that know such marks

