@@ -13,6 +13,7 @@ import subprocess
 import sys
 import threading
 import unittest
+from functools import partial
 from pathlib import Path
 
 from certificates import Authority
@@ -21,6 +22,7 @@ from programs import as_windows, start
 TEXT = b"encrypted\n" * 1000
 REPLY = b"HTTP/1.1 200 OK\r\nContent-Length: %d\r\n\r\n" % len(TEXT)
 NO_LENGTH = b"HTTP/1.1 200 OK\r\n\r\n"
+REDIRECT = b"HTTP/1.1 302 Found\r\nContent-Length: 0\r\nLocation: %s://localhost:1/\r\n\r\n"
 
 
 class Conversation:
@@ -68,32 +70,20 @@ class Conversation:
             self.until(self.tls.write, data[i:i + piece])
 
 
-def cut(peer, reply=REPLY, sent=len(TEXT), piece=16384):
+def cut(peer, reply=REPLY, sent=len(TEXT), piece=16384, records=-1):
+    peer.records = records
     peer.until(peer.tls.do_handshake)
     peer.request()
     peer.write(reply + TEXT[:sent], piece)
 
 
-def good(peer, reply=REPLY, piece=16384):
-    cut(peer, reply, piece=piece)
+def good(peer, **how):
+    cut(peer, **how)
     peer.until(peer.tls.unwrap)
 
 
-def redirect(peer):
-    good(peer, b"HTTP/1.1 302 Found\r\nLocation: http://localhost:1/\r\nContent-Length: 0\r\n\r\n")
-
-
-def stall(peer, records):
-    peer.records = records
-    good(peer)
-
-
-def plain(peer):
-    peer.connection.sendall(REPLY + TEXT)
-    peer.connection.recv(65536)
-
-
-def closed(peer):
+def plain(peer, reply=REPLY + TEXT):
+    peer.connection.sendall(reply)
     peer.connection.recv(65536)
 
 
@@ -176,19 +166,19 @@ CERTIFICATES = [
 # What a server does, what the client says of it, with which version, by which scheme.
 BEHAVIOURS = [
     ("good", good, "0 ", TLS_1_2),
-    ("a byte in each record", lambda peer: good(peer, piece=1), "0 "),
-    ("no length", lambda peer: good(peer, NO_LENGTH), "0 "),
+    ("a byte in each record", partial(good, piece=1), "0 "),
+    ("no length", partial(good, reply=NO_LENGTH), "0 "),
     ("no announced end, all of the length", cut, "0 "),
-    ("no announced end, a part of the length", lambda peer: cut(peer, sent=100),
+    ("no announced end, a part of the length", partial(cut, sent=100),
      f"{CLOSED} GET /f: the connection was closed too early"),
-    ("no announced end, no length", lambda peer: cut(peer, NO_LENGTH),
+    ("no announced end, no length", partial(cut, reply=NO_LENGTH),
      f"{CLOSED} GET /f: the connection was closed without an announced end"),
     ("in the clear", plain, WITH + "the answer is not encrypted"),
-    ("closed", closed, f"{CLOSED} encryption with localhost: the connection was closed"),
+    ("closed", partial(plain, reply=b""), f"{CLOSED} encryption with localhost: the connection was closed"),
     ("old", good, WITH + "it does not speak TLS 1.2 or later", TLS_1_1),
-    ("a redirect out of it", redirect, f"{REFUSED} GET /f: 302 Found"),
-    ("no PBSZ", lambda peer: refuse(peer, b"PBSZ"), f"{ENCRYPTION} PBSZ 0: 534 so be it", None, "ftps"),
-    ("no PROT", lambda peer: refuse(peer, b"PROT"), f"{ENCRYPTION} PROT P: 534 so be it", None, "ftps"),
+    ("a redirect out of it", partial(good, reply=REDIRECT % b"http"), f"{REFUSED} GET /f: 302 Found"),
+    ("no PBSZ", partial(refuse, refused=b"PBSZ"), f"{ENCRYPTION} PBSZ 0: 534 so be it", None, "ftps"),
+    ("no PROT", partial(refuse, refused=b"PROT"), f"{ENCRYPTION} PROT P: 534 so be it", None, "ftps"),
 ]
 
 
@@ -248,13 +238,9 @@ class Encryption(unittest.TestCase):
                 version, scheme = [*more, *(None, "https")[len(more):]]
                 self.expect(self.good(behave, version), end, scheme=scheme)
         self.expect(OpensslServer(self.certificate), WITH + "it wants a second handshake")
-
-    def test_redirect(self):
-        """From http:// into encryption; on the way back to http:// it would be refused."""
-        encrypted = self.good()
-        to_it = b"HTTP/1.1 302 Found\r\nLocation: https://localhost:%d/f\r\n\r\n" % encrypted.port
-        self.expect(self.good(lambda peer: (peer.connection.recv(65536),
-                                            peer.connection.sendall(to_it))), "0 ", scheme="http")
+        encrypted = self.good()  # and from http:// into it
+        into = (REDIRECT % b"https").replace(b":1/", b":%d/f" % encrypted.port)
+        self.expect(self.good(partial(plain, reply=into)), "0 ", scheme="http")
         encrypted.close()
 
     @unittest.skipIf(len(sys.argv) > 3, "Windows encrypts by itself")
@@ -277,7 +263,7 @@ class Encryption(unittest.TestCase):
         for version, records in [(None, 0), (None, 1), *((TLS_1_2, i) for i in range(6))]:
             with self.subTest(version=version, records=records):
                 for more, end in ((300,), silence), ((20000, 300), f"{CANCELLED} cancelled"):
-                    self.expect(self.good(lambda peer: stall(peer, records), version), end, more=more)
+                    self.expect(self.good(partial(good, records=records), version), end, more=more)
 
 
 programs, folder = Path(sys.argv[1]).absolute(), Path(sys.argv[2]).absolute()
