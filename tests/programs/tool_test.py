@@ -31,23 +31,18 @@ ROWS = [
     ("match -- -x -?", 0, ""),
     ("path normalize a\\.\\b\\..\\\\c\\", 0, "a/c\n"),
     ("path normalize a/$ZV_NO_SUCH_NAME/b", 1, "", "variable after a/\n"),
-    ("path normalize /..", 1, "", "climbs above its root"),
     ("path normalize a/..", 0, ".\n"),
     ("path normalize ", 1, "", "empty path"),
     ("path normalize " + "x" * 320, 1, "", "319"),
     ("path absolute ../../x --base D:/app", 1, "", "above the base's root"),
     ("path absolute ../lib/x.dll --base D:/app/bin", 0, "D:/app/lib/x.dll\n"),
-    ("path absolute //srv/share/x --base D:/app", 0, "//srv/share/x\n"),
     ("path relative D:/a --base E:/a", 1, "", "no root in common"),
-    ("path relative D:/a --base D:/A", 0, ".\n"),
     ("path split //srv/share/a/b", 0, "//srv/share/\na\nb\n"),
     ("path split /a --json", 0, '["/", "a"]\n'),
-    (r"path normalize a\b --json", 0, '"a/b"\n'),
     ("path locate no-such-program", 1, "", "no folder of PATH has no-such-program"),
     ("scan tree", 0, "a.TXT\nb.txt\nsub\n"),
-    ("scan tree --files *.txt --match-case", 0, "b.txt\n"),
-    ("scan tree --dirs s*", 0, "sub\n"),
     ("scan tree/ --recursive --files *.bin;a*", 0, "tree/a.TXT\ntree/sub/x.bin\n"),
+    ("scan tree --files *.txt --dirs s* --match-case", 0, "b.txt\nsub\n"),
     ("scan tree --json", 0, '["a.TXT", "b.txt", "sub"]\n'),
     ("scan tree --files *.no --json", 0, "[]\n"),
     ("scan no-such", 1, "", "no-such: No such file or directory"),
@@ -76,7 +71,6 @@ ROWS = [
     ("--version", 0, "zv 1.0.0b\n"),
     ("rm tree", 1, "", "--yes removes tree"),  # no terminal here
     ("rm / --yes", 1, "", "neither a root"),
-    ("rm ./ --yes", 1, "", "neither a root"),
     ("rm tree/.. --yes", 1, "", "neither a root"),
     ("rm copied --yes", 1, "", "Not a directory"),
     ("scan tree --recursive --files b*", 0, "tree/b.txt\ntree/sub/b.txt\n"),
@@ -135,29 +129,27 @@ class Tool(unittest.TestCase):
                 self.assertEqual(subprocess.run([tool, "info"], stdout=full, stderr=subprocess.DEVNULL,
                                                 timeout=60, check=False).returncode, 1)
 
-    def test_failures_of_the_moment(self):
-        """They are tried again, twice unless told otherwise; what may have been delivered is not."""
+    def test_servers(self):
+        """Failures of the moment are tried again, twice unless told otherwise; what may have been
+        delivered is not."""
+        (work / "secret").write_text("hush\r\nmore")
         get, put, mail = "copy {} got", "copy tree/b.txt {}", "copy tree/b.txt {}/you@example.org"
-        for line, server, code, connections in (
-                (get + " --retries 0", HttpServer(broken=2), 3, 1),
-                (get + " --retries 1", HttpServer(broken=2), 3, 2),
-                (get, HttpServer(broken=2), 0, 3),
-                (get + " --retries 1", HttpServer(status=b"503 Busy"), 3, 2),
-                (get, HttpServer(status=b"404 Not Found"), 3, 1),
-                (put, HttpServer(broken=1), 0, 2),
-                (mail + " --retries 9", MailServer(broken=1), 4, 2)):
+        for line, server, code, connections, why in (
+                (get + " --retries 0", HttpServer(broken=2), 3, 1, "closed"),
+                (get + " --retries 1", HttpServer(broken=2), 3, 2, "closed"),
+                (get, HttpServer(broken=2), 0, 3, ""),
+                (get + " --retries 1", HttpServer(status=b"503 Busy"), 3, 2, "503 Busy"),
+                (get, HttpServer(status=b"404 Not Found"), 3, 1, "404 Not Found"),
+                (get + " --retries 0 --timeout 0.4", HttpServer(pause=5), 3, 1, "0.4 s"),
+                (get + " --retries 0 --max-time 0.4", HttpServer(pause=5), 3, 1, "0.4 s"),
+                (mail + " --retries 9", (post := MailServer(broken=1)), 4, 2, "closed"),
+                (put + " --user me --password-file secret", (web := HttpServer(broken=1)), 0, 2, "")):
             with self.subTest(line, connections=connections):
                 found = self.zv(*line.format(server.url).split(" "))
                 self.assertEqual((found[0], server.connections), (code, connections), found[2])
-        self.assertEqual((server.messages, (work / "got").read_bytes()), (1, HttpServer.BODY))
-
-    def test_login_and_limits(self):
-        (work / "secret").write_text("hush\r\nmore")
-        server, slow = HttpServer(), HttpServer(pause=5).url
-        self.check([(f"copy tree/b.txt {server.url} --user me --password-file secret", 0, ""),
-                    (f"copy {slow} got --timeout 0.4 --retries 0", 3, "", "0.4 s"),
-                    (f"copy {slow} got --max-time 0.4 --retries 0", 3, "", "0.4 s")])
-        self.assertIn(b"Authorization: Basic bWU6aHVzaA==\r\n", server.head)  # me:hush
+                self.assertIn(why, found[2])
+        self.assertEqual((post.messages, (work / "got").read_bytes()), (1, HttpServer.BODY))
+        self.assertIn(b"Authorization: Basic bWU6aHVzaA==\r\n", web.head)  # me:hush
 
     @unittest.skipUnless(len(sys.argv) == 5, "needs a terminal of Linux")
     def test_at_a_terminal(self):
@@ -196,37 +188,34 @@ class Tool(unittest.TestCase):
             self.assertEqual(copy.returncode, 128 + number)
             self.assertEqual((sorted(os.listdir(work)), (work / "got").read_text()), (before, "old"))
         with subprocess.Popen([tool, "copy", "pipe", "got"], cwd=work) as copy:
-            for _ in range(2):
+            while copy.poll() is None:
                 time.sleep(0.3)
                 copy.send_signal(signal.SIGINT)
-            self.assertEqual(copy.wait(timeout=5), -signal.SIGINT)
+        self.assertEqual(copy.returncode, -signal.SIGINT)
 
-    def test_plugins_without_any(self):
+    def test_plugins(self):
         """Each file once, whatever it is: what the library would not try is not tried here."""
         names = [f"img_none{d}.dll" for d in ("", "d", "dd", "dddd")]
         write_files(work, dict.fromkeys(names, "no library"))
-        code, output, _ = self.zv("plugins", "img", "--json")
-        found = json.loads(output)
-        self.assertEqual((code, [row["library"] for row in found]), (1, names))
+        found = json.loads(self.zv("plugins", "img", "--json")[1])
+        self.assertEqual([row["library"] for row in found], names)
         self.assertRegex(found[0]["reason"], "^cannot be loaded: .{10}")
         self.assertEqual((found[1]["status"], found[3]["status"]), ("skipped", "rejected"))
-        self.assertEqual([line.split(None, 2) for line in self.zv("plugins", "img.reader")[1].splitlines()],
-                         [list(row.values()) for row in found])
-        for api in ("other", ".img", "img" * 16, "", "im"):
-            found = self.zv("plugins", api, "--json")
-            self.assertEqual((*found[:2], found[2][:4]), (1, "[]\n", "zv: "))
+        code, shown, _ = self.zv("plugins", "img.reader")
+        self.assertEqual((code, [line.split(None, 2) for line in shown.splitlines()]),
+                         (1, [list(row.values()) for row in found]))
+        self.check([(f"plugins {api} --json", 1, "[]\n", "zv: ") for api in
+                    ("other", ".img", "img" * 16, "", "im")])
 
     @unittest.skipUnless(len(sys.argv) > 3 and sys.argv[3], "the examples are not built")
     def test_plugins_of_the_gallery(self):
-        words = ("plugins", "img", "--dir", plugins, "--max", "1")
-        code, output, _ = self.zv(*words)
+        code, shown, _ = self.zv("plugins", "img", "--dir", plugins, "--max", "1")
+        self.assertEqual(code, 0)
         # A debug build's plugins are named with a "d" at the end.
-        self.assertRegex(output, r"(?m)^img_bmpd?\.dll +accepted +version 1  Windows bitmap\|\.bmp\|")
-        self.assertRegex(output, r"(?m)^img_tomorrowd?\.dll +rejected  too new: version \d+$")
-        bmp, = (plugin for plugin in json.loads(self.zv(*words, "--json")[1])
-                if plugin["library"].startswith("img_bmp"))
-        self.assertEqual((code, bmp["status"], bmp["version"], bmp["formats"]),
-                         (0, "accepted", 1, ["Windows bitmap|.bmp|.dib|"]))
+        self.assertRegex(shown, r"(?m)^img_bmpd?\.dll +accepted +version 1  Windows bitmap\|\.bmp\|")
+        self.assertRegex(shown, r"(?m)^img_tomorrowd?\.dll +rejected  too new: version \d+$")
+        self.assertIn('"status": "accepted", "version": 1, "formats": ["Windows bitmap|.bmp|.dib|"]',
+                      self.zv("plugins", "img", "--dir", plugins, "--max", "1", "--json")[1])
         self.assertEqual(self.zv("plugins", "img", "--dir", plugins, "--min", "7", "--max", "5")[0], 1)
 
     @unittest.skipIf(len(sys.argv) > 5, "is for a shell of Linux")
