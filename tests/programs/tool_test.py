@@ -137,6 +137,7 @@ class Tool(unittest.TestCase):
         for line, server, code, connections, why in (
                 (get + " --retries 0", HttpServer(broken=2), 3, 1, "closed"),
                 (get + " --retries 1", HttpServer(broken=2), 3, 2, "closed"),
+                (get, HttpServer(broken=9), 3, 3, "closed"),
                 (get, HttpServer(broken=2), 0, 3, ""),
                 (get + " --retries 1", HttpServer(status=b"503 Busy"), 3, 2, "503 Busy"),
                 (get, HttpServer(status=b"404 Not Found"), 3, 1, "404 Not Found"),
