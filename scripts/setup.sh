@@ -36,7 +36,7 @@ missing_packages() {
     dpkg-query -W -f '${db:Status-Status} ${Package} ${Architecture}\n' "$@" 2>/dev/null |
         awk -v own="$own" '$1 == "installed" { print $2 ":" $3
             if ($3 == own || $3 == "all") print $2 }' |
-        sort | comm -13 - <(printf '%s\n' "$@" | sort)
+        sort -u | comm -13 - <(printf '%s\n' "$@" | sort -u)
 }
 
 # A server's package must start no service: the tests start their own servers, on loopback.

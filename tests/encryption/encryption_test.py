@@ -193,15 +193,13 @@ class Encryption(unittest.TestCase):
     def expect(self, server, expected, host="localhost", trusted=None, more=(), scheme="https",
                fetch="zarvo_fetch", **environment):
         """Both runs of one handle end so; a file that was there stays but for a good end."""
-        shown = as_windows if emulator else str
         copy = folder / "copy"
         copy.write_bytes(b"old")
-        try:
-            found = start(*emulator, programs / (fetch + suffix), f"{scheme}://{host}:{server.port}/f",
-                          shown(copy), trusted or shown(self.authority.certificate) if trusted != "" else "", *more,
-                          env=environment)
-        finally:
-            server.close()
+        trusted = self.authority.certificate if trusted is None else trusted
+        paths = [as_windows(path) if emulator and path else path for path in (copy, trusted)]
+        found = start(*emulator, programs / (fetch + suffix), f"{scheme}://{host}:{server.port}/f", *paths,
+                      *more, env=environment)
+        server.close()
         self.assertEqual(found, (0, f"{expected}\n" * 2, ""))
         self.assertEqual(copy.read_bytes(), TEXT if expected == "0 " else b"old")
 
@@ -220,7 +218,7 @@ class Encryption(unittest.TestCase):
     def test_trust(self):
         """Without a file it goes by the system's certificates, which on Linux two variables name."""
         itself, ours = self.authority.issue_itself("itself", "localhost"), self.authority.certificate
-        self.expect(Server(itself, good), "0 ", trusted=as_windows(itself) if emulator else itself)
+        self.expect(Server(itself, good), "0 ", trusted=itself)
         not_trusted = f"{CERTIFICATE} of localhost: signed by itself, and not trusted"
         self.expect(Server(itself, good), not_trusted, SSL_CERT_FILE=str(itself))
         self.expect(self.good(), f"{CERTIFICATE} of localhost: its issuer is not trusted", trusted="")

@@ -63,20 +63,18 @@ class Documents(unittest.TestCase):
         build("int codec_v2(void); int codec_v2(void) { return 2; }", work / "codecs/fast.dll",
               "-shared", "-fPIC")
         cls.families = header.read(source / "include/zarvo.h")[1]
-        cls.plugin, = (text for family in cls.families for text in map("\n".join, family.examples)
-                       if "ZV_PLUGIN_EXPORT" in text)
-        build(INCLUDES + cls.plugin, work / "plugins/img_sample.dll", "-shared", "-fPIC")
+        cls.blocks = ["\n".join(lines) for family in cls.families for lines in family.examples]
+        plugin, = (block for block in cls.blocks if "ZV_PLUGIN_EXPORT" in block)
+        cls.blocks.remove(plugin)
+        build(INCLUDES + plugin, work / "plugins/img_sample.dll", "-shared", "-fPIC")
         Path(given["HTTP_ROOT"], "data.bin").write_text("data")
 
     def test_examples(self):
         self.assertEqual([family.name for family in self.families if not family.examples], [])
-        blocks = ["\n".join(lines) for family in self.families for lines in family.examples]
-        blocks.remove(self.plugin)
         layer = re.search(r"(?s)@code\{.cpp\}\n(.*) \* @endcode", (source / "include/zarvo.hpp").read_text())
-        blocks.append("// zarvo.hpp\n" + re.sub(r"(?m)^ \* ", "", layer[1]))
-        readme = re.findall(r"```c(?:pp)?\n(.*?)```", (source / "README.md").read_text(), flags=re.S)
-        self.assertTrue(readme)
-        for block in readme + blocks:
+        blocks = ["// zarvo.hpp\n" + re.sub(r"(?m)^ \* ", "", layer[1]), *self.blocks, *re.findall(
+            r"```c(?:pp)?\n(.*?)```", (source / "README.md").read_text(), flags=re.S)]
+        for block in blocks:
             with self.subTest(block=block):
                 text = URL.sub(on_loopback, block)
                 if "int main(" not in text:
