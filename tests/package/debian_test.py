@@ -5,7 +5,6 @@ machine's files where it can.
 
     debian_test.py PACKAGE...
 """
-import gzip
 import os
 import sys
 import tempfile
@@ -56,24 +55,22 @@ class Debian(unittest.TestCase):
                                    ("libzarvo-tls1", "Depends", r"libc6 .*, libssl3 .*"),
                                    ("zv", "Recommends", "libzarvo-tls1")):
             self.assertRegex(run("dpkg-query", "-W", "-f", "${%s}" % field, name), f"^{value}$")
-        self.assertTrue(Path("/usr/share/bash-completion/completions/zv").exists())
 
     def test_1_documents(self):
-        families = header.read(SOURCE / "include/zarvo.h")[1]
-        for name, texts in (("zv", ["NAME"]), ("zv_copy", ["Copying between"]),
-                            *((f"zarvo_{family.name}", sum(family.examples, [])) for family in families)):
+        pages = {"zv": ["NAME"], "zv_copy": ["Copying between"]}
+        for family in header.read(SOURCE / "include/zarvo.h")[1]:
+            pages[f"zarvo_{family.name}"] = sum(family.examples, [])
+        for name, texts in pages.items():
             code, page, warnings = start("man", "--warnings", "-P", "cat", name, env={"MANWIDTH": "200"})
-            self.assertEqual((code, warnings), (0, ""))
-            self.assertEqual([text for text in texts if text not in page], [])
-        for name in NAMES:
-            folder = Path("/usr/share/doc", name)
-            self.assertIn("MIT License", (folder / "copyright").read_text())
-            self.assertIn("[1.0.0b]", gzip.open(folder / "changelog.gz", "rt").read())
+            self.assertEqual((code, warnings, [text for text in texts if text not in page]), (0, "", []))
 
     def test_2_nothing_stays(self):
-        listed = {path for name in NAMES for path in run("dpkg", "-L", name).split()
+        listed = {path for path in run("dpkg", "-L", *NAMES).split()
                   if not os.path.isdir(path) or "zarvo" in path or path.endswith("/zv")}
-        self.assertGreater(len(listed), 100)
+        for name in NAMES:
+            self.assertLess({f"/usr/share/doc/{name}/{file}" for file in ("copyright", "changelog.gz")},
+                            listed)
+        self.assertIn("/usr/share/bash-completion/completions/zv", listed)
         run("dpkg", "--purge", *NAMES)
         self.assertEqual([path for path in listed if os.path.lexists(path)], [])
         self.assertNotIn("libzarvo", run("ldconfig", "-p"))

@@ -22,10 +22,10 @@ class Installed:
         self.emulator = [emulator] * bool(emulator)
         root.mkdir(parents=True, exist_ok=True)
 
-    def run_program(self, program, *words, **more):
+    def run_program(self, program, *words):
         env = {"LD_LIBRARY_PATH": str(self.prefix / "lib"),
                "WINEPATH": as_windows(self.prefix / "bin")} if self.prefix else {}
-        return run(*self.emulator, program, *words, env=env, **{"cwd": self.root, **more})
+        return run(*self.emulator, program, *words, env=env, cwd=self.root)
 
     def pkg_config(self, *words):
         env = {"PKG_CONFIG_LIBDIR": str(self.prefix / "lib/pkgconfig")} if self.prefix else None

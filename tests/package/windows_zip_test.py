@@ -26,25 +26,24 @@ class OldRuntime(unittest.TestCase):
         cls.installed = Installed(cls.root, cls.prefix, "x86_64-w64-mingw32-gcc-posix",
                                   toolchains / cls.toolchain, emulator)
 
-    def test_runtime(self):
-        """The library and its programs are all on the one runtime."""
+    def test_programs(self):
+        """They and the library are all on the one runtime."""
         for file in (*self.prefix.glob("bin/*"), *self.prefix.glob("plugins/*")):
             names = re.findall(r"DLL Name: (msvcrt\.dll|api-ms-win-crt)",
                                run("x86_64-w64-mingw32-objdump", "-p", file))
             self.assertEqual({*names}, {self.needed}, file)
+        self.installed.run_program(self.prefix / "bin/make_samples.exe", "samples")
+        self.assertRegex(self.installed.run_program(self.prefix / "bin/gallery.exe", self.prefix / "plugins",
+                                                    "samples", "sheet.png"), "rings.png +PNG image +240 x 160")
+        if self.runtime == "msvcrt":
+            self.assertEqual(self.installed.run_program(self.prefix / "bin/zv.exe", "--version"),
+                             "zv 1.0.0b\n")
 
     def test_applications(self):
         """CMake takes zarvo.lib for compilers that it calls MSVC."""
         for name, definitions in ("lib/libzarvo.dll.a", []), ("lib/zarvo.lib", ["-DMSVC=1"]):
             self.installed.expect_cmake_consumers(self, *definitions)
             self.assertIn(name, (self.root / "consumer/build.ninja").read_text())
-
-    def test_programs(self):
-        if self.runtime == "msvcrt":
-            self.assertEqual(self.installed.run_program(self.prefix / "bin/zv.exe", "--version"),
-                             "zv 1.0.0b\n")
-        run(sys.executable, SOURCE / "tests/programs/gallery_test.py", self.prefix / "bin/gallery.exe",
-            self.prefix / "bin/make_samples.exe", self.prefix / "plugins", emulator)
 
 
 class UniversalRuntime(OldRuntime):

@@ -1,9 +1,10 @@
 /* An application of the installed package, in C99: calls that take and give each kind of thing that
    crosses the interface. Prints what is wrong and ends with 1, or prints "consumer: ok". */
+#include <zarvo.h>
+
 #include <stddef.h>
 #include <stdio.h>
 #include <string.h>
-#include <zarvo.h>
 
 static int failures;
 

@@ -1,9 +1,9 @@
 // An application of the C++ layer, in C++17: every owner and every result. Prints what is wrong and
 // ends with 1, or prints "consumer: ok".
+#include <zarvo.hpp>
+
 #include <cstdio>
 #include <utility>
-
-#include <zarvo.hpp>
 
 namespace {
 
@@ -25,11 +25,15 @@ void paths() {
       {zarvo::normalize_path(longer), {}},
       {zarvo::normalize_path(nul), {}},
       {zarvo::normalize_path(std::string_view("a/b/c", 3)), "a/b"},
+      {zarvo::absolute("../x", "D:/a/b"), "D:/a/x"},
       {zarvo::absolute("xyz", "/" + longest.substr(3)), {}},
       {zarvo::absolute("x", std::string()), {}},
       {zarvo::absolute("x"), *zarvo::working_directory() + "/x"},
       {zarvo::relative("D:/a/x", "D:/a"), "x"},
+      {zarvo::extract_directory("a/b.c"), "a"},
+      {zarvo::extract_filename("a/b.c"), "b.c"},
       {zarvo::extract_extension("a/b.c"), ".c"},
+      {zarvo::path_locate("no-such-file"), {}},
       {zarvo::pathmap_locate("no-such/file"), {}},
       {zarvo::fmt_force("PNG image|.png|", "photo"), "photo.png"},
   };
