@@ -184,24 +184,21 @@ TEST(Handle, WhileItRuns) {
 }
 
 TEST(Handle, BodiesMustMove) {
-  const ScratchFolder folder;
-  const auto pause = [] { std::this_thread::sleep_for(std::chrono::milliseconds(200)); };
-  struct Case {
-    int silence, speed, cause;
-  };
-  const Case cases[] = {{1000, 0, ZV_CAUSE_NONE},
-                        {500, 1000, ZV_CAUSE_SPEED},
-                        {100, -1, ZV_CAUSE_SILENCE},
-                        {0, 1000, ZV_CAUSE_NONE}};
-  for (const auto& [silence, speed, cause] : cases) {
+  const auto cause_with = [](int silence, int speed) {
+    const auto pause = [] { std::this_thread::sleep_for(std::chrono::milliseconds(200)); };
     Steps steps = {{"GET", "HTTP/1.1 200 OK\r\nContent-Length: 5\r\n\r\n"}};
     for (const char* const letter : {"h", "e", "l", "l", "o"})
       steps.push_back({unasked, letter, "", pause});
     DialogueServer server(steps);
+    const ScratchFolder folder;
     const HandlePtr handle =
         new_handle({{ZV_TRANSFER_SILENCE, silence}, {ZV_TRANSFER_SPEED, speed}});
-    EXPECT_EQ(outcome_of(handle, server.url("http", "/f"), folder.path("got")).cause, cause);
-  }
+    return outcome_of(handle, server.url("http", "/f"), folder.path("got")).cause;
+  };
+  EXPECT_EQ(cause_with(1000, 0), ZV_CAUSE_NONE);
+  EXPECT_EQ(cause_with(500, 1000), ZV_CAUSE_SPEED);
+  EXPECT_EQ(cause_with(100, -1), ZV_CAUSE_SILENCE);
+  EXPECT_EQ(cause_with(0, 1000), ZV_CAUSE_NONE);
 }
 
 // By another thread, and by the watch.
