@@ -25,7 +25,7 @@ constexpr int (*ways[])(const std::string& from, const std::string& to) = {copy,
 // Every size at which a copy goes on in another way.
 TEST(CopyLocal, EverySize) {
   const ScratchFolder folder;
-  for (const size_t size : {0, 1, 65535, 65536, 65537, 20 << 20}) {
+  for (const size_t size : {0u, 1u, 65535u, 65536u, 65537u, 20u << 20}) {
     std::string content(size, 'x');
     for (size_t i = 0; i < size; ++i) content[i] = static_cast<char>(i * 7 + i / 256);
     for (const auto way : ways) {
