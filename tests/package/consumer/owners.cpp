@@ -38,8 +38,8 @@ void paths() {
       {zarvo::fmt_force("PNG image|.png|", "photo"), "photo.png"},
   };
   for (const auto& row : rows) EXPECT(row.first == row.second);
-  EXPECT(zarvo::split_path("D:/a/b") == (Texts{"D:/", "a", "b"}));
-  EXPECT(zarvo::split_path(longest) == Texts{longest} && zarvo::split_path(longer).empty());
+  EXPECT(zarvo::split_path("/" + longest.substr(1)) == (Texts{"/", longest.substr(1)}));
+  EXPECT(zarvo::split_path(longer).empty());
   EXPECT(zarvo::username() && zarvo::hostname() && zarvo::pathlist().size() > 0);
   EXPECT(zv_putenv_private("it", "one", 0) && zv_putenv_private("it", "two", 1));
   EXPECT(zarvo::getenv_private("IT") == (Texts{"one", "two"}));
@@ -88,7 +88,6 @@ void rest() {
   zarvo::Plugins plugins("no-such", 1, 2);
   EXPECT(!plugins && plugins.formats().size() == 0 && !zarvo::Loaded(plugins.for_file("a.png")));
   EXPECT(zarvo::copy("layer/file", "layer/copy") == Copied::whole);
-  EXPECT(zarvo::copy("layer/none", "layer/copy") == Copied::source_failed);
   zarvo::Transfer transfer;
   std::int64_t moved = -1;
   const auto watch = [&](std::int64_t done, std::int64_t) { return (moved = done) >= 0; };
