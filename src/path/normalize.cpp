@@ -1,4 +1,5 @@
 // A path as somebody wrote it, brought into canonical form.
+#include <algorithm>
 #include <cctype>
 #include <cstdlib>
 #include <cstring>
@@ -45,7 +46,7 @@ void squeeze(char* text) {
 
 // The two separators in front of a share are not doubled ones.
 void squeeze_path(zv::PathBuffer& path) {
-  const size_t start = zv::share_size(path.view()) != 0 ? 2 : 0;
+  const size_t start = zv::share_size(path.view()) != 0 ? std::min<size_t>(2, path.size()) : 0;
   path.edit_shrinking([start](char* text) { squeeze(text + start); });
 }
 

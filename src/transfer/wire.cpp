@@ -251,7 +251,8 @@ int64_t Wire::receive(std::span<char> room) {
 }
 
 Sent Wire::send_some(std::string_view& bytes, Wire* answers) {
-  const bool beside = answers != nullptr && answers != this;
+  const Wire& other = answers != nullptr ? *answers : *this;
+  const bool beside = &other != this;
   for (;;) {
     int64_t most = 0;
     if (!may_wait(most)) return Sent::failed;
@@ -267,7 +268,7 @@ Sent Wire::send_some(std::string_view& bytes, Wire* answers) {
     const bool to_write = step == Step::wants_to_write;
     std::array<platform::Waiting, 2> waiting = {
         {{.socket = socket_, .to_read = !to_write || answers == this, .to_write = to_write},
-         {.socket = beside ? answers->socket_ : socket_, .to_read = true}}};
+         {.socket = other.socket_, .to_read = true}}};
     if (!wait_for({waiting.data(), beside ? size_t{2} : size_t{1}})) return Sent::failed;
     const bool may_be_answered = beside ? waiting[1].can_read : to_write && waiting[0].can_read;
     // What arrived may be the encryption's own message.

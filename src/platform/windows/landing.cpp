@@ -72,9 +72,10 @@ void find_name(Place& place) {
 
 // "\\.\name", in either separator style: a device or a pipe of that name.
 bool is_device_path(std::string_view path) {
-  constexpr std::string_view separators = "/\\";
-  return path.size() > 3 && path[2] == '.' && separators.find(path[0]) != separators.npos &&
-         separators.find(path[1]) != separators.npos && separators.find(path[3]) != separators.npos;
+  const auto is_separator = [path](size_t place) {
+    return path[place] == '/' || path[place] == '\\';
+  };
+  return path.size() > 3 && is_separator(0) && is_separator(1) && path[2] == '.' && is_separator(3);
 }
 
 // Opened for nothing but what it tells about itself.
@@ -221,7 +222,7 @@ FILE* open_in_place(const Place& place, unsigned bits, bool keep) {
 }
 
 bool flush_file(FILE* stream) {
-  const auto handle = reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(stream)));
+  auto* const handle = reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(stream)));
   return GetFileType(handle) != FILE_TYPE_DISK || FlushFileBuffers(handle) != 0;
 }
 
