@@ -31,10 +31,8 @@ class Variable {
     *std::getenv(name_.c_str()) = '\0';
     SetEnvironmentVariableA(name_.c_str(), "");  // from where Wine takes them anew
 #else
-    if (value)
-      setenv(name_.c_str(), value->c_str(), 1);
-    else
-      unsetenv(name_.c_str());
+    if (!value) unsetenv(name_.c_str());
+    if (value) setenv(name_.c_str(), value->c_str(), 1);
 #endif
   }
 
@@ -56,26 +54,14 @@ class WorkingDirectory {
   std::filesystem::path old_;
 };
 
-// Gives a drive such as "C:" a current folder, or takes it back, as Windows remembers it when the
-// process leaves the drive.
-inline void set_drive_folder(const std::string& drive, const char* folder) {
-#ifdef _WIN32
-  SetEnvironmentVariableA(("=" + drive).c_str(), folder);
-#else
-  static_cast<void>(drive), static_cast<void>(folder);
-#endif
-}
-
 #ifdef _WIN32
 // Names a home folder in a registry tree of its own, which stands in for the user's.
 class Home {
  public:
-  explicit Home(const std::optional<std::string>& folder) {
-    name_ = "Software\\zarvo-test-" + std::to_string(GetCurrentProcessId());
-    RegCreateKeyExA(HKEY_CURRENT_USER, name_.c_str(), 0, nullptr, REG_OPTION_VOLATILE,
-                    KEY_ALL_ACCESS, nullptr, &user_, nullptr);
-    RegCreateKeyExA(user_, key, 0, nullptr, REG_OPTION_VOLATILE, KEY_ALL_ACCESS, nullptr, &folders_,
-                    nullptr);
+  explicit Home(const std::optional<std::string>& folder)
+      : name_("Software\\zarvo-test-" + std::to_string(GetCurrentProcessId())) {
+    user_ = made(HKEY_CURRENT_USER, name_.c_str());
+    folders_ = made(user_, "Software\\Microsoft\\Windows\\CurrentVersion\\Explorer\\Shell Folders");
     RegOverridePredefKey(HKEY_CURRENT_USER, user_);
     set(folder);
   }
@@ -91,17 +77,22 @@ class Home {
 
   void set(const std::optional<std::string>& folder) {
     RegDeleteValueA(folders_, "Personal");
-    if (!folder) return;
-    RegSetValueExA(folders_, "Personal", 0, REG_SZ, reinterpret_cast<const BYTE*>(folder->c_str()),
-                   static_cast<DWORD>(folder->size() + 1));
+    if (folder)
+      RegSetValueExA(folders_, "Personal", 0, REG_SZ,
+                     reinterpret_cast<const BYTE*>(folder->c_str()),
+                     static_cast<DWORD>(folder->size() + 1));
   }
 
  private:
-  static constexpr char key[] =
-      "Software\\Microsoft\\Windows\\CurrentVersion\\Explorer\\Shell Folders";
+  static HKEY made(HKEY above, const char* name) {
+    HKEY key = nullptr;
+    RegCreateKeyExA(above, name, 0, nullptr, REG_OPTION_VOLATILE, KEY_ALL_ACCESS, nullptr, &key,
+                    nullptr);
+    return key;
+  }
+
   std::string name_;
-  HKEY user_ = nullptr;
-  HKEY folders_ = nullptr;
+  HKEY user_, folders_;
 };
 #else
 class Home : public Variable {

@@ -14,7 +14,6 @@
 #include "failures/failing_calls.h"
 #include "fixtures/dialogues.h"
 #include "fixtures/plugins/plugin_folder.h"
-#include "fixtures/private_values.h"
 #include "handle.h"
 #include "platform/platform.h"
 #include "string_list.h"

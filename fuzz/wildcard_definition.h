@@ -1,10 +1,15 @@
-// What a wildcard match is, written out: recursive, with its rule for giving up. Tests and fuzzing
-// hold the matcher against it.
-#ifndef ZARVO_TESTS_WILDCARD_DEFINITION_H
-#define ZARVO_TESTS_WILDCARD_DEFINITION_H
+// What a wildcard match is, written out: recursive, with its rule for giving up; and texts with
+// patterns that often match them. Tests and fuzzing hold the matcher against it.
+#ifndef ZARVO_FUZZ_WILDCARD_DEFINITION_H
+#define ZARVO_FUZZ_WILDCARD_DEFINITION_H
 
+#include <cstddef>
 #include <cstring>
+#include <iterator>
+#include <sstream>
 #include <string>
+#include <utility>
+#include <vector>
 
 class WildcardDefinition {
  public:
@@ -107,6 +112,48 @@ class WildcardDefinition {
       if (*text == '\0') return Outcome::give_up;
     }
   }
+};
+
+// `choose(limit)` gives a number below the limit.
+template <class Choose>
+class WildcardGenerator {
+ public:
+  explicit WildcardGenerator(Choose choose) : choose_(std::move(choose)) {
+    std::istringstream words(
+        "a a b b c - ] ^ [ * ? \\ \xC3\xA9 \xC3\xA0 \xE2\x82\xAC \xC3 \xA9 \x80 \xE2\x82 "
+        "\xF8\x88\x80\x80\x81 \xFC\x84\x80\x80\x80\x81 \xFE \xFF");
+    for (std::string word; words >> word;) pieces_.push_back(word);
+  }
+
+  std::string text(size_t length) {
+    std::string made;
+    while (length-- > 0) made += pieces_[choose_(pieces_.size())];
+    return made;
+  }
+
+  // Some of the text's pieces, and wild ones instead of others.
+  std::string pattern_for(const std::string& text) {
+    std::string made;
+    for (size_t at = 0; at < text.size();) {
+      const std::string piece = text.substr(at, 1 + choose_(2) * choose_(4));
+      const std::string ways[] = {piece,       piece, piece, '\\' + piece, "*",
+                                  "*" + piece, "?",   set(), this->text(1)};
+      made += ways[choose_(std::size(ways))];
+      at += piece.size();
+    }
+    return choose_(8) == 0 ? made + "*\\"[choose_(2)] : made;
+  }
+
+ private:
+  std::string set() {
+    std::string made = choose_(3) == 0 ? "[^" : "[";
+    for (size_t members = 1 + choose_(3); members > 0; --members)
+      made += text(1) + (choose_(2) == 0 ? '-' + text(1) : "");
+    return choose_(10) == 0 ? made : made + ']';
+  }
+
+  Choose choose_;
+  std::vector<std::string> pieces_;
 };
 
 #endif
