@@ -2,11 +2,8 @@
 // of a handle, which has other rules.
 #include <algorithm>
 #include <chrono>
-#include <filesystem>
 #include <regex>
 #include <sstream>
-#include <thread>
-#include <vector>
 
 #include "fixtures/dialogues.h"
 #include "handle.h"
@@ -275,39 +272,34 @@ TEST(Handle, FtpReplies) {
         {"SIZE:550 no", "SIZE:550 no|RETR:125 (f) already (5 bytes)", "PASS:202 in", "PASV:227 &",
          "RETR:150-a\r\n 150 b\r\n151 c\r\n150-d\r\n150", ":120 wait\r\n220 now"});
   check("ftp", ZV_CAUSE_NONE, "", {"SIZE:213 0|<data out>:"});
-  check("ftp", ZV_CAUSE_CLOSED, "RETR /f: the",
-        {"SIZE:213 6", "SIZE:550 no|RETR:150 (f) (6 bytes)"});
-  check("ftp", ZV_CAUSE_PROTOCOL, "more bytes than were told", {"SIZE:213 4"});
-  check("ftp", ZV_CAUSE_PROTOCOL, "SIZE /f: no size",
-        {"SIZE:213 9223372036854775808", "SIZE:213 -5"});
-  check("ftp", ZV_CAUSE_TOO_LARGE, "larger", {"SIZE:213 5", "SIZE:550 no"}, {ZV_TRANSFER_SIZE, 4});
   check("ftp", ZV_CAUSE_NONE, "hello", {"SIZE:213 5", "SIZE:550 no"}, {ZV_TRANSFER_SIZE, 5});
   check("ftp", ZV_CAUSE_NONE, "hello", {"SIZE:213 5"}, {ZV_TRANSFER_TIME, -1});
   check("ftp", ZV_CAUSE_NONE, "hello", {"SIZE:213 5"}, {ZV_TRANSFER_KEEP, -1});
-  check("ftp", ZV_CAUSE_REFUSED, "RETR /f: ", {"RETR:550 No such file.", "RETR:500 pw"});
-  check("ftp", ZV_CAUSE_REFUSED_NOW, "RETR /f: ", {"RETR:450 busy"});
+  check("ftp", ZV_CAUSE_TOO_LARGE, "larger", {"SIZE:213 5", "SIZE:550 no"}, {ZV_TRANSFER_SIZE, 4});
+  check("ftp", ZV_CAUSE_CLOSED, "RETR /f: the",
+        {"SIZE:213 6", "SIZE:550 no|RETR:150 (f) (6 bytes)"});
+  check("ftp", ZV_CAUSE_PROTOCOL, "RETR /f: more bytes than were told", {"SIZE:213 4"});
+  check("ftp", ZV_CAUSE_PROTOCOL, "SIZE /f: no size",
+        {"SIZE:213 9223372036854775808", "SIZE:213 -5"});
   check("ftp", ZV_CAUSE_PROTOCOL, "RETR /f: a reply without a code", {"RETR:999 what"});
-  check("ftp", ZV_CAUSE_PROTOCOL, "longer than 64", {"RETR:150-" + repeated("x\r\n150-", 20000)});
-  check("ftp", ZV_CAUSE_PROTOCOL, "longer than 8 KiB", {"RETR:" + std::string(9000, '1')});
+  check("ftp", ZV_CAUSE_PROTOCOL, "longer than",
+        {"RETR:150-" + repeated("x\r\n150-", 20000), "RETR:" + std::string(9000, '1')});
+  check("ftp", ZV_CAUSE_PROTOCOL, "PASV: ", {"PASV:227 no numbers", "PASV:250 done"});
   check("ftp", ZV_CAUSE_SILENCE, "RETR /f: no reply within 0.1 s", {"RETR:"}, silence);
   check("ftp", ZV_CAUSE_SILENCE, "within 0.1 s", {":" + repeated("120 x\r\n", 5000000)}, silence);
   check("ftp", ZV_CAUSE_TIME, "not done within 0.35 s", {"RETR:"}, {ZV_TRANSFER_TIME, 350});
-  check("ftp", ZV_CAUSE_REFUSED_NOW, ": ", {":421 full", "PASS:421 later"});
-  check("ftp", ZV_CAUSE_REFUSED, ": ", {":530 no"});
   check("ftp", ZV_CAUSE_LOGIN, ": ", {"PASS:530 no pw", "USER:332 account"});
-  check("ftp", ZV_CAUSE_PROTOCOL, "PASV: ", {"PASV:227 no numbers", "PASV:250 done"});
-  check("ftp", ZV_CAUSE_REFUSED, "PASV: ", {"PASV:502 no"});
+  check("ftp", ZV_CAUSE_REFUSED_NOW, ": ", {":421 full", "PASS:421 later", "RETR:450 busy"});
+  check("ftp", ZV_CAUSE_REFUSED, ": ", {":530 no", "PASV:502 no", "RETR:550 None.", "RETR:500 pw"});
 }
 
 TEST(Handle, MailReplies) {
   check("smtp", ZV_CAUSE_NONE, "", {"QUIT:421 later", "EHLO:502 what|HELO:250 hello"});
-  check("smtp", ZV_CAUSE_REFUSED_NOW, ": ", {":421 busy", "EHLO:421 busy"});
   check("smtp", ZV_CAUSE_LOGIN, "AUTH LOGIN: ", {"cHc=:535 not pw", "dUBk:535 no"});
-  check("smtp", ZV_CAUSE_REFUSED_NOW, "AUTH LOGIN: ", {"AUTH LOGIN:454 later"});
   check("smtp", ZV_CAUSE_REFUSED, "MAIL FROM:<u@d.test>: ", {"MAIL:550 no"});
-  check("smtp", ZV_CAUSE_REFUSED_NOW, "RCPT TO:<f>: ", {"RCPT:450 grey"});
-  check("smtp", ZV_CAUSE_REFUSED, "DATA: ", {"DATA:554 no"});
-  check("smtp", ZV_CAUSE_REFUSED, "message: ", {"<mail end>:552 full"});
+  check("smtp", ZV_CAUSE_REFUSED, ": ", {"DATA:554 no", "<mail end>:552 full"});
+  check("smtp", ZV_CAUSE_REFUSED_NOW, ": ",
+        {":421 busy", "EHLO:421 busy", "AUTH LOGIN:454 later", "RCPT:450 grey"});
   check("smtp", ZV_CAUSE_SILENCE, "may have been delivered", {"<mail end>:"},
         {ZV_TRANSFER_SILENCE, 300});
 }

@@ -1,8 +1,6 @@
 // What a run does on the local disk: a destination takes its place whole, keeps what it passes on,
 // or is refused; whatever fails, the old file stays and nothing else does.
 #include <cerrno>
-#include <filesystem>
-#include <vector>
 
 #include "handle.h"
 #include "scratch_folder.h"

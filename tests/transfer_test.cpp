@@ -3,9 +3,6 @@
 #include <algorithm>
 #include <cerrno>
 #include <chrono>
-#include <filesystem>
-#include <thread>
-#include <vector>
 
 #include "fixtures/dialogues.h"
 #include "handle.h"
