@@ -42,6 +42,7 @@ int copy(const Option& option, const std::string& from, const std::string& to) {
 
 struct Landing : testing::Test {
   const ScratchFolder folder;
+  const std::string new_file = folder.make_file("new", "content");
 
   // From a file, "new" as a rule. What succeeds leaves its content, what fails what was there.
   void check(const Option& option, const Outcome& end, std::initializer_list<std::string> places,
@@ -66,10 +67,9 @@ struct Landing : testing::Test {
 TEST_F(Landing, WhatIsThere) {
   for (const char* const name : {"old", "linked", "folder/old"})
     folder.make_file(name, "what was there before");
-  folder.make_file("new", "content");
   folder.make_file("empty");
   fs::create_hard_link(folder.path("linked"), folder.path("other name"));
-  fs::create_hard_link(folder.path("new"), folder.path("new too"));
+  fs::create_hard_link(new_file, folder.path("new too"));
   std::string longest = "folder/";
   while (folder.path(longest).size() < 317) longest += "./";
   longest += "x";
@@ -94,13 +94,12 @@ TEST_F(Landing, WhatIsThere) {
   check({ZV_TRANSFER_SIZE, 0}, landed, {"old"}, "empty");
   EXPECT_EQ(folder.content("other name"), "content");
   for (const Outcome& end : {landed, exists})
-    expect_end(outcome_of(new_handle({in_place, keep}), folder.path("new"), folder.path("both")),
-               end);
+    expect_end(outcome_of(new_handle({in_place, keep}), new_file, folder.path("both")), end);
 }
 
 // Between two pieces, and after the last one: nothing has landed until it has its name.
 TEST_F(Landing, Cancelled) {
-  const std::string from = folder.make_file("from", std::string(size_t{20} << 20, 'x'));
+  folder.make_file("new", std::string(size_t{20} << 20, 'x'));
   const std::string to = folder.make_file("to", "old");
   const auto watch = [](void* stop, int64_t done, int64_t) {
     return done < *static_cast<int64_t*>(stop) ? 0 : 1;
@@ -108,7 +107,7 @@ TEST_F(Landing, Cancelled) {
   for (int64_t stop : {int64_t{0}, int64_t{20} << 20}) {
     const HandlePtr handle = new_handle();
     zv_transfer_watch(handle.get(), watch, &stop);
-    expect_end(outcome_of(handle, from, to),
+    expect_end(outcome_of(handle, new_file, to),
                {stop == 0 ? -3 : -4, ZV_CAUSE_CANCELLED, 0, "cancelled"});
     EXPECT_EQ(folder.content("to"), "old");
     EXPECT_EQ(std::distance(fs::directory_iterator(folder.path()), {}), 2);
@@ -118,14 +117,13 @@ TEST_F(Landing, Cancelled) {
 #ifdef _WIN32
 
 TEST_F(Landing, ReadOnlyFiles) {
-  folder.make_file("new", "content");
   folder.make_file("old", "what was there before");
   fs::permissions(folder.path("old"), fs::perms::owner_read);
   check(plain, refused("ZV_TRANSFER_IN_PLACE"), {"old"});
   check(in_place, local(-4, EACCES), {"old"});
   check(plain, landed, {"made"}, "old");
   check(plain, local(-4, ENOENT), {"made/x", "bad|name"});
-  EXPECT_EQ(copy(plain, folder.path("new"), folder.path("nul")), 0);
+  EXPECT_EQ(copy(plain, new_file, folder.path("nul")), 0);
   for (const char* const name : {"old", "made"}) {
     EXPECT_EQ(fs::status(folder.path(name)).permissions() & fs::perms::owner_write,
               fs::perms::none);
@@ -136,7 +134,6 @@ TEST_F(Landing, ReadOnlyFiles) {
 #else
 
 TEST_F(Landing, LinksAndDevices) {
-  folder.make_file("new", "content");
   folder.make_file("folder/file", "what was there before");
   const int open_file = ::open(folder.make_file("open").c_str(), O_RDWR | O_CLOEXEC);
   const auto link = [this](const char* name, const std::string& target) {
@@ -221,24 +218,23 @@ struct stat status_of(const std::string& path) {
 }
 
 TEST_F(Landing, Rights) {
-  const std::string from = folder.make_file("from", "content");
   const std::string old = folder.make_file("old", "old");
   const std::string made = folder.path("made");
   const mode_t mask = ::umask(027);
-  ::chmod(from.c_str(), 06775);
+  ::chmod(new_file.c_str(), 06775);
   EXPECT_TRUE(::geteuid() != 0 || ::chown(old.c_str(), 12345, 54321) == 0);
   ::chmod(old.c_str(), 07604);
   const bool has_lists = set_list(old, access_list);
   const struct stat before = status_of(old);
   for (const Option& option : {plain, sync_it}) {
-    EXPECT_EQ(copy(option, from, old), 0);
+    EXPECT_EQ(copy(option, new_file, old), 0);
     const struct stat after = status_of(old);
     EXPECT_EQ(after.st_mode, before.st_mode & 0777);
     EXPECT_TRUE(after.st_uid == before.st_uid && after.st_gid == before.st_gid);
     EXPECT_TRUE(!has_lists || access_list_of(old) == one_more_user);
   }
   for (const Option& option : {plain, in_place}) {
-    EXPECT_EQ(copy(option, from, made), 0);
+    EXPECT_EQ(copy(option, new_file, made), 0);
     EXPECT_EQ(status_of(made).st_mode, 0750u);
     fs::remove(made);
   }
@@ -246,10 +242,10 @@ TEST_F(Landing, Rights) {
   if (has_lists && set_list(folder.path(), "system.posix_acl_default")) {
     EXPECT_EQ(::removexattr(old.c_str(), access_list), 0);
     ::chmod(old.c_str(), 0640);
-    EXPECT_EQ(copy(plain, from, old), 0);
+    EXPECT_EQ(copy(plain, new_file, old), 0);
     EXPECT_EQ(access_list_of(old), "");
     EXPECT_EQ(status_of(old).st_mode, 0640u);
-    EXPECT_EQ(copy(plain, from, made), 0);
+    EXPECT_EQ(copy(plain, new_file, made), 0);
     EXPECT_NE(access_list_of(made), "");
   }
   ::umask(mask);
