@@ -29,7 +29,8 @@ if(WIN32)
   endif()
 else()
   # libzarvo_tls is looked for beside it too, wherever it is installed.
-  set_target_properties(zarvo PROPERTIES BUILD_RPATH $ORIGIN INSTALL_RPATH $ORIGIN)
+  set_target_properties(zarvo PROPERTIES BUILD_RPATH $ORIGIN INSTALL_RPATH $ORIGIN
+    LINK_DEPENDS ${CMAKE_CURRENT_BINARY_DIR}/zarvo.map)
   target_link_libraries(zarvo PRIVATE ${CMAKE_DL_LIBS})
   target_link_options(zarvo PRIVATE
     -Wl,--version-script,${CMAKE_CURRENT_BINARY_DIR}/zarvo.map
