@@ -19,9 +19,10 @@ WINDOWS_OWN = {f"{name}.dll" for name in "kernel32 msvcrt advapi32 ws2_32 crypt3
 class Package(unittest.TestCase):
     @classmethod
     def setUpClass(cls):
-        cls.root = Path(tempfile.mkdtemp())
+        # CMake itself finds no package below brackets.
+        cls.root = Path(tempfile.mkdtemp(dir="/tmp" if "[" in tempfile.gettempdir() else None)).resolve()
         cls.addClassCleanup(shutil.rmtree, cls.root)
-        cls.prefix = cls.root / "pr\u00e4 fix"  # CMake itself finds nothing below brackets
+        cls.prefix = cls.root / "pr\u00e4 fix"
         run("cmake", "--install", args.build, "--prefix", cls.prefix)
         cls.installed = Installed(cls.root, cls.prefix, args.cc, args.toolchain, args.emulator)
         cls.library = cls.prefix / ("bin/zarvo.dll" if args.windows else "lib/libzarvo.so")
