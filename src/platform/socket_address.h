@@ -3,15 +3,6 @@
 #ifndef ZARVO_PLATFORM_SOCKET_ADDRESS_H
 #define ZARVO_PLATFORM_SOCKET_ADDRESS_H
 
-#ifdef _WIN32
-#include <winsock2.h>
-#include <ws2tcpip.h>
-#else
-#include <netdb.h>
-#include <netinet/in.h>
-#include <sys/socket.h>
-#endif
-
 #include <cstring>
 #include <memory>
 

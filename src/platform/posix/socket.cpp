@@ -1,4 +1,5 @@
 // Stream sockets over IPv4.
+#include <netdb.h>
 #include <netinet/in.h>
 #include <netinet/tcp.h>
 #include <poll.h>

@@ -1,6 +1,8 @@
 // Stream sockets that never wait in a call, over IPv6 and IPv4.
 #include <arpa/inet.h>
 #include <linux/sockios.h>
+#include <netdb.h>
+#include <netinet/in.h>
 #include <netinet/tcp.h>
 #include <poll.h>
 #include <sys/ioctl.h>

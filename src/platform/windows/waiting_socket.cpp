@@ -1,4 +1,7 @@
 // Stream sockets that never wait in a call, over IPv6 and IPv4.
+#include <winsock2.h>
+#include <ws2tcpip.h>
+
 #include <cerrno>
 #include <cstdio>
 
