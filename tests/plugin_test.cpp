@@ -278,7 +278,13 @@ TEST_F(Plugin, AnArrayIsWholeWhilePluginsRun) {
     EXPECT_EQ(add_lib(folder.add("accept", name), 0), 1);
   EXPECT_EQ(take_names(), "img_b.dll;img_a.dll;img_c.dll;");
   zv_putenv_private("img", ".", 0);
+  char name[] = "stale";  // what the caller's variable held before, no plugin sees
+  zv_plugin_t stale = {};
+  stale.lib = name;
+  zv_plugin_t* before[] = {&stale, nullptr};
+  plugins = before;
   enumerate();
+  if (plugins == before) plugins = nullptr;
   EXPECT_EQ(records().size(), 3u);
 }
 

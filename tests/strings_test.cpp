@@ -249,7 +249,6 @@ TEST(Wildcard, Table) {
   using Texts = std::vector<std::string>;
   const std::tuple<const char*, Texts, Texts> cases[] = {
       {"", {""}, {"a"}},
-      {"**", {"", "any"}, {}},
       {"?", {"\xC3\xA9", "\xE9"}, {"", "\xFE\x80"}},
       {"*.txt", {"file.txt", ".txt"}, {"file.TXT", "txt"}},
       {"ab*b", {"abb"}, {"ab"}},  // the end may not be used twice
@@ -259,9 +258,7 @@ TEST(Wildcard, Table) {
       {"[a-d--9-]", {"5", "-"}, {}},  // a to d, then - to 9
       {"[d-a]", {"d"}, {"a", "c"}},
       {"[\\]", {"\\"}, {}},
-      {"*\\.b", {"a.b"}, {"a-b"}},
       {"a\\", {}, {"a", "a\\"}},
-      {"*[a", {}, {"a", "[a"}},
       {"[]", {}, {"a", "[]"}},
       {"[\xC3\xA0-\xC3\xAA]", {"\xC3\xA9", "\xE9"}, {"\xC3\xAB"}},  // or the same value
       {"*\xA9", {"x\xA9"}, {"\xC3\xA9"}},                           // inside a character
