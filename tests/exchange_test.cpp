@@ -234,7 +234,10 @@ TEST(Handle, EarlyAnswers) {
   DialogueServer put({{"PUT", "HTTP/1.1 413 Too large\r\n\r\n"}, {until_closed, ""}});
   EXPECT_EQ(outcome_of(handle, file, put.url("http", "/f")).reason,
             "PUT /f: 413 Too large; the destination may hold a part");
-  DialogueServer stor(ftp({{"STOR", "150 send\r\n452 full\r\n"}, {data_in, ""}}));
+  const auto pause = [] { std::this_thread::sleep_for(std::chrono::milliseconds(700)); };
+  DialogueServer stor(ftp(
+      {{"STOR", "150 send\r\n"}, {unasked, "452 full\r\n", "", pause}, {data_in, "", "", pause}}));
+  zv_transfer_set(handle.get(), ZV_TRANSFER_SILENCE, 1000);
   EXPECT_EQ(outcome_of(handle, file, stor.url("ftp", "/f")).reason,
             "STOR /f: 452 full; the destination may hold a part");
 }
