@@ -211,8 +211,9 @@ TEST(Environment, PutAndGet) {
     EXPECT_EQ(zv_putenv_private(name, value, append), result);
     EXPECT_EQ(private_values(name != nullptr ? name : "A"), values);
   }
-  for (const char* const value : {"", "", "b"}) zv_putenv_private("A", value, 1);
+  for (const char* const value : {"", "", "b"}) ASSERT_EQ(zv_putenv_private("A", value, 1), 1);
   char* const block = zv_getenv_private("a");
+  ASSERT_NE(block, nullptr);
   zv_putenv_private("A", "changed", 0);
   EXPECT_EQ(std::string(block, 4), std::string("\0b\0\0", 4));
   zv_free(block);

@@ -376,7 +376,6 @@ TEST_F(Plugin, CandidatesAndTheirReports) {
 
   std::string reports, events, accepted;
   List listed;  // in the platform's order
-  zv_strlist_free(listed.list, -1);
   zv_dir_scan("", &listed.list, nullptr, nullptr, 0, 0);
   ASSERT_NE(listed.list, nullptr);
   for (char** name = listed.list; *name != nullptr; ++name) {

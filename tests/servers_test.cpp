@@ -149,13 +149,15 @@ TEST(Servers, WhatAHandleFollows) {
 TEST(Servers, AnUploadCancelledHalfWay) {
   if (set("FTP_PORT").empty()) GTEST_SKIP() << "no FTP server without root";
   const std::string ftp = host("ftp", "FTP_PORT", login) + "/pub/";
-  local.put("large", bytes(64 << 20));
+  local.put("whole", bytes(1 << 20));
+  local.put("cancelled", "");
+  fs::resize_file(local.folder / "cancelled", uintmax_t{8} << 30);  // it takes no room
   const HandlePtr handle(zv_transfer_create());
   const auto began = [](void*, int64_t done, int64_t) { return static_cast<int>(done > 0); };
   for (const bool cancelled : {true, false}) {
     if (cancelled) zv_transfer_watch(handle.get(), began, nullptr);
-    const std::string to = ftp + (cancelled ? "cancelled" : "whole");
-    zv_transfer_run(handle.get(), (local.url + "large").c_str(), to.c_str());
+    const std::string name = cancelled ? "cancelled" : "whole";
+    zv_transfer_run(handle.get(), (local.url + name).c_str(), (ftp + name).c_str());
     EXPECT_EQ(zv_transfer_cause(handle.get(), nullptr), cancelled ? ZV_CAUSE_CANCELLED : 0);
     zv_transfer_watch(handle.get(), nullptr, nullptr);
     zv_transfer_reset(handle.get());
