@@ -235,11 +235,14 @@ TEST(Handle, EarlyAnswers) {
   EXPECT_EQ(outcome_of(handle, file, put.url("http", "/f")).reason,
             "PUT /f: 413 Too large; the destination may hold a part");
   const auto pause = [] { std::this_thread::sleep_for(std::chrono::milliseconds(700)); };
-  DialogueServer stor(ftp(
+  DialogueServer later(ftp(
       {{"STOR", "150 send\r\n"}, {unasked, "452 full\r\n", "", pause}, {data_in, "", "", pause}}));
-  zv_transfer_set(handle.get(), ZV_TRANSFER_SILENCE, 1000);
-  EXPECT_EQ(outcome_of(handle, file, stor.url("ftp", "/f")).reason,
-            "STOR /f: 452 full; the destination may hold a part");
+  DialogueServer at_once(ftp({{"STOR", "150 send\r\n452 full\r\n"}, {data_in, "", "", pause}}));
+  for (const auto& [stor, silence] : {std::pair(&later, 1000), {&at_once, 400}}) {
+    zv_transfer_set(handle.get(), ZV_TRANSFER_SILENCE, silence);
+    EXPECT_EQ(outcome_of(handle, file, stor->url("ftp", "/f")).reason,
+              "STOR /f: 452 full; the destination may hold a part");
+  }
 }
 
 // Five redirects, and the login for its own server alone.

@@ -264,6 +264,7 @@ Sent Wire::send_some(std::string_view& bytes, Wire* answers) {
       return Sent::some;
     }
     if (!has_to_wait(step)) return Sent::cut;
+    if (answers != nullptr && answers->begin_ != answers->end_) return Sent::answered;
 
     const bool to_write = step == Step::wants_to_write;
     std::array<platform::Waiting, 2> waiting = {
