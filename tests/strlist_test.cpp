@@ -106,7 +106,7 @@ TEST(StringList, FindAndCompare) {
 TEST(StringList, SetKeepsTheFirst) {
   for (const unsigned count : {0u, 1u, 2u, 15u, 16u, 1000u}) {
     for (const bool nocase : {false, true}) {
-      List list, kept;
+      List list(""), kept("");
       for (unsigned i = 0; i < count; ++i) {
         const unsigned number = i * 2654435761U % (count / 3 + 1);
         const char* const names[] = {"name.", "Name.", "NAME."};
