@@ -2,7 +2,7 @@
 //
 // A place is worth a closer look where the bytes under the needle's first, middle and last one fit.
 // That much is tested for a whole block of places at once, in vectors that the compiler maps to
-// what the machine has: ten times as fast as place by place.
+// what the machine has: many times as fast as std::search, which goes place by place (bench).
 #include "strings/find.h"
 
 #include <bit>
